@@ -1,0 +1,195 @@
+#include "app/Commands.h"
+
+#include <unistd.h>
+
+#include <CLI/CLI.hpp>
+#include <deque>
+#include <fstream>
+#include <iostream>
+
+#include "app/Demo.h"
+#include "app/Tsv.h"
+#include "app/Workspace.h"
+#include "host/UException.h"
+#include "host/automate/Automate.h"
+#include "host/automate/Registry.h"
+#include "host/ui/TerminalDriver.h"
+
+namespace quarvo::app {
+
+using namespace host;
+
+namespace {
+
+struct Options {
+  std::string db = "quarvo.db";
+  std::string company = "DEMO";
+  std::string user = "demo";
+  std::vector<std::string> answers;
+};
+
+// The caller's side of a run: one text field per argument, passed by reference so the
+// automaton's results come back into them.
+struct CallerFields {
+  std::vector<std::unique_ptr<Field>> fields;
+  std::vector<Arg> args;
+
+  explicit CallerFields(const std::vector<std::string>& values) {
+    for (size_t i = 0; i < values.size(); ++i) {
+      fields.push_back(std::make_unique<Field>("ARG" + std::to_string(i), "", "", 4, Kind::Chaine,
+                                               Valeur::chaine(values[i]), nullptr));
+      args.push_back(fields.back().get());
+    }
+  }
+  void print(std::ostream& out) const {
+    for (size_t i = 0; i < fields.size(); ++i) out << i << "=" << fields[i]->text() << "\n";
+  }
+};
+
+void checkConversions(const Evt& evt, const std::vector<std::string>& values) {
+  if (evt.refus().empty()) return;
+  int i = evt.refus().front();
+  throw UsageError("parameter " + std::to_string(i) + " ('" + values[static_cast<size_t>(i)] +
+                   "') does not convert to the kind of the field it is bound to");
+}
+
+int printOutcome(std::ostream& out, int outcome) {
+  out << "outcome: " << (outcome == 0 ? "ok" : "failed") << "\n";
+  return outcome == 0 ? 0 : 1;
+}
+
+}  // namespace
+
+int runCommandLine(int argc, char** argv, std::ostream& out, std::ostream& err) {
+  CLI::App cli{"QUARVO: purchase pieces linked to project budgets"};
+  cli.require_subcommand(1);
+  Options o;
+  cli.add_option("--db", o.db, "Database file")->capture_default_str();
+  cli.add_option("--company", o.company, "Company code of the session")->capture_default_str();
+  cli.add_option("--user", o.user, "User of the session")->capture_default_str();
+  cli.add_option("--answer", o.answers,
+                 "Answer to the next dialog (button number or text); repeat in order. Dialogs "
+                 "without an answer are refused");
+
+  bool demoData = false;
+  auto* init = cli.add_subcommand("init", "Create the schema (idempotent)");
+  init->add_flag("--demo", demoData, "Seed the demo data set");
+
+  std::string table;
+  std::string file;
+  auto* load = cli.add_subcommand("load", "Load rows of a table from a tab-separated file");
+  load->add_option("TABLE", table, "Table name")->required();
+  load->add_option("FILE", file, "Tab-separated file with a header of column names")->required();
+
+  std::vector<std::string> where;
+  auto* dump = cli.add_subcommand("dump", "Print the rows of a table, tab-separated");
+  dump->add_option("TABLE", table, "Table name")->required();
+  dump->add_option("--where", where, "COL=VALUE filter (repeatable)");
+
+  auto* automata = cli.add_subcommand("automata", "List the registered automata");
+
+  std::string name;
+  std::string label;
+  std::vector<std::string> params;
+  auto* run = cli.add_subcommand("run", "Run a registered automaton with positional parameters");
+  run->add_option("NAME", name, "Automaton name")->required();
+  run->add_option("ARGS", params, "Positional parameters");
+
+  auto* call = cli.add_subcommand("call", "Run a label of a module's interface automaton");
+  call->add_option("MODULE", name, "Module name")->required();
+  call->add_option("LABEL", label, "Procedure label")->required();
+  call->add_option("ARGS", params, "Positional parameters");
+
+  std::string demoDir = "quarvo-demo";
+  auto* demo = cli.add_subcommand("demo", "Build a demo database and show what QUARVO does");
+  demo->add_option("--dir", demoDir, "Folder to create afresh")->capture_default_str();
+
+  for (auto* sub : {run, call}) sub->allow_extras(false);
+  run->prefix_command(false);
+
+  try {
+    cli.parse(argc, argv);
+  } catch (const CLI::ParseError& e) {
+    if (e.get_exit_code() == 0) {
+      out << cli.help();
+      if (auto* s = cli.get_subcommands().empty() ? nullptr : cli.get_subcommands().front()) {
+        (void)s;
+      }
+      return 0;
+    }
+    return cli.exit(e, out, err) == 0 ? 0 : 2;
+  }
+
+  try {
+    std::deque<std::string> answers(o.answers.begin(), o.answers.end());
+    TerminalDriver ui(err, answers, isatty(STDERR_FILENO) != 0);
+
+    if (*demo) return runDemo(demoDir, out, err);
+
+    if (*automata) {
+      for (const auto& n : Registry::instance().names()) out << n << "\n";
+      return 0;
+    }
+
+    std::unique_ptr<Workspace> ws = *init ? Workspace::init(o.db) : Workspace::open(o.db);
+    Session& session = ws->startSession(ui, o.company, o.user);
+    Session::Scope scope(session);
+
+    if (*init) {
+      bool seeded = demoData && ws->seedDemo();
+      out << "database " << o.db << " ready" << (seeded ? " with the demo data" : "") << "\n";
+      return 0;
+    }
+    if (*load) {
+      std::ifstream in(file, std::ios::binary);
+      if (!in) throw UsageError("cannot read " + file);
+      size_t n = loadTsv(session, table, in, file);
+      out << n << " rows loaded into " << table << "\n";
+      return 0;
+    }
+    if (*dump) {
+      std::vector<std::pair<std::string, std::string>> filters;
+      for (const auto& w : where) {
+        auto eq = w.find('=');
+        if (eq == std::string::npos) throw UsageError("--where expects COL=VALUE, not '" + w + "'");
+        filters.emplace_back(w.substr(0, eq), w.substr(eq + 1));
+      }
+      dumpTsv(session, table, filters, out);
+      return 0;
+    }
+    if (*run) {
+      CallerFields caller(params);
+      EvtParamRef evt(caller.args);
+      AutomatePtr automate = session.creer(name, &evt);
+      if (!automate) throw UsageError("unknown automaton " + name + " (see 'quarvo automata')");
+      checkConversions(evt, params);
+      automate->executer(&evt);
+      session.executerEnAttente();
+      caller.print(out);
+      return printOutcome(out, automate->outcome());
+    }
+    if (*call) {
+      if (!Registry::instance().find(name + "-INTERFACE")) {
+        throw UsageError("unknown module " + name);
+      }
+      CallerFields caller(params);
+      EvtParamRef evt(caller.args);
+      int outcome = session.appelerProcedure(name, label, &evt);
+      session.executerEnAttente();
+      caller.print(out);
+      return printOutcome(out, outcome);
+    }
+  } catch (const UsageError& e) {
+    err << "quarvo: " << e.what() << "\n";
+    return 2;
+  } catch (const UException& e) {
+    err << "quarvo: " << e.what() << "\n";
+    return 2;
+  } catch (const std::exception& e) {
+    err << "quarvo: " << e.what() << "\n";
+    return 2;
+  }
+  return 0;
+}
+
+}  // namespace quarvo::app

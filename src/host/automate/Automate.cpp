@@ -1,0 +1,219 @@
+#include "host/automate/Automate.h"
+
+#include <charconv>
+
+#include "host/session/Session.h"
+#include "host/table/Table.h"
+#include "host/ui/Ecran.h"
+
+namespace quarvo::host {
+
+Automate::Automate(Evt*) : session_(Session::current()) {}
+
+Automate::~Automate() = default;
+
+Field& Automate::declare(Kind kind, std::string name, std::string label, Valeur initial,
+                         int access) {
+  auto field =
+      std::make_unique<Field>(name, std::move(label), "", access, kind, std::move(initial), this);
+  Field& ref = *field;
+  fieldIndex_[name] = &ref;
+  fields_.push_back(std::move(field));
+  return ref;
+}
+
+Field& Automate::chaine(std::string name, std::string label, std::string initial) {
+  return declare(Kind::Chaine, std::move(name), std::move(label),
+                 Valeur::chaine(std::move(initial)));
+}
+Field& Automate::entier(std::string name, std::string label, int64_t initial) {
+  return declare(Kind::Entier, std::move(name), std::move(label), Valeur::entier(initial));
+}
+Field& Automate::dbl(std::string name, std::string label) {
+  return declare(Kind::Double, std::move(name), std::move(label), Valeur::dbl(0.0));
+}
+Field& Automate::date(std::string name, std::string label) {
+  return declare(Kind::Date, std::move(name), std::move(label), Valeur::date(Date()));
+}
+Field& Automate::monnaie(std::string name, std::string label) {
+  return declare(Kind::Monnaie, std::move(name), std::move(label), Valeur::monnaie(Monnaie()));
+}
+
+Field* Automate::champ(const std::string& name) const {
+  auto it = fieldIndex_.find(name);
+  return it == fieldIndex_.end() ? nullptr : it->second;
+}
+
+Table* Automate::tableParContexte(const std::string& contextOrName) const {
+  for (Table* t : tables_) {
+    if (!t->context().empty() && t->context() == contextOrName) return t;
+  }
+  for (Table* t : tables_) {
+    if (t->name() == contextOrName) return t;
+  }
+  return nullptr;
+}
+
+void Automate::addBranch(const std::string& label, Handler handler) {
+  auto open = label.find('(');
+  if (open == std::string::npos || label.back() != ')') {
+    branches_[label] = Branch{std::move(handler), 0, label};
+    return;
+  }
+  // "TRANSFORMER(3,4)": one handler reached by "TRANSFORMER3" and "TRANSFORMER4".
+  std::string stem = label.substr(0, open);
+  std::string list = label.substr(open + 1, label.size() - open - 2);
+  size_t start = 0;
+  while (start <= list.size()) {
+    size_t comma = list.find(',', start);
+    std::string item = list.substr(start, comma == std::string::npos ? std::string::npos
+                                                                     : comma - start);
+    int n = 0;
+    std::from_chars(item.data(), item.data() + item.size(), n);
+    branches_[stem + std::to_string(n)] = Branch{handler, n, label};
+    if (comma == std::string::npos) break;
+    start = comma + 1;
+  }
+}
+
+void Automate::lierParametres(Evt* evt, std::initializer_list<std::pair<Field*, int>> params) {
+  if (evt == nullptr) return;
+  int index = 0;
+  for (const auto& [field, kind] : params) {
+    if (evt->nbParams() != 0) evt->param(index, *field, kind);
+    ++index;
+  }
+}
+
+bool Automate::hasBranch(const std::string& label) const { return branches_.count(label) > 0; }
+
+bool Automate::raise(const std::string& label, Evt* evt) {
+  auto it = branches_.find(label);
+  if (it == branches_.end()) return false;
+  Branch& branch = it->second;
+  numero_ = branch.numero;
+  if (evt != nullptr) {
+    evt->setNumero(branch.numero);
+    evt->setErreur(0);
+  }
+  rejected_ = false;
+  try {
+    branch.handler(evt);
+  } catch (UException& e) {
+    e.setLabel(branch.declared);
+    if (evt != nullptr) {
+      evt->adresseC(&e);
+      exception(evt);
+      evt->adresseC(nullptr);
+    } else {
+      EvtParamVal temporary;
+      temporary.adresseC(&e);
+      exception(&temporary);
+    }
+  }
+  return true;
+}
+
+void Automate::exception(Evt* evt) {
+  const UException* e = evt ? evt->adresseC() : nullptr;
+  std::string where = e ? e->label() : std::string("?");
+  std::string what = e ? e->what() : std::string("?");
+  session_.ui().incident("Erreur d'exécution dans " + name_ + " (" + where + ") : " + what);
+  // A handler interrupted by a fault has not done its work: its caller must not read success.
+  erreurMethode(1, evt);
+}
+
+void Automate::erreurMethode(int flag, Evt* evt) {
+  outcome_ = flag;
+  if (evt != nullptr) evt->setErreur(flag);
+}
+
+void Automate::sortir(Evt*, int) { ended_ = true; }
+
+void Automate::rejeter(Evt* evt) {
+  rejected_ = true;
+  if (evt != nullptr) evt->setErreur(1);
+}
+
+void Automate::controler(const std::string& control) { ecran().focus(control); }
+
+void Automate::appelerProcedure(const std::string&, const std::string& module,
+                                const std::string&, const std::string& label, Evt* evt, int) {
+  if (module.empty()) {
+    EvtParamVal none;
+    Evt* e = evt != nullptr ? evt : &none;
+    if (!raise(label, e)) {
+      session_.ui().incident("La procédure " + label + " n'existe pas dans " + name_ + ".");
+      callOutcome_ = 1;
+      return;
+    }
+    callOutcome_ = e->erreur();
+    return;
+  }
+  callOutcome_ = session_.appelerProcedure(module, label, evt);
+}
+
+void Automate::lancerProcedure(const std::string& instance, const std::string& module,
+                               const std::string& automaton, const std::string& label, Evt* evt,
+                               int flag) {
+  Evt copy = evt != nullptr ? evt->byValue() : EvtParamVal();
+  if (module.empty()) {
+    // Own labels run while this automaton lives; queued work for it ends with it.
+    session_.lancer([this, label, copy]() mutable {
+      if (!termine()) raise(label, &copy);
+    });
+    return;
+  }
+  Session& s = session_;
+  s.lancer([&s, module, label, copy]() mutable { s.appelerProcedure(module, label, &copy); });
+  (void)instance;
+  (void)automaton;
+  (void)flag;
+}
+
+void Automate::appelerModule(const std::string&, const std::string&, const std::string& name,
+                             Evt* evt) {
+  callOutcome_ = session_.appelerModule(name, evt);
+}
+
+void Automate::lancerModule(const std::string&, const std::string&, const std::string& name,
+                            Evt* evt) {
+  if (!Registry::instance().find(name)) {
+    session_.ui().incident("Le traitement " + name + " n'est pas disponible dans cette version.");
+    callOutcome_ = 1;
+    return;
+  }
+  Evt copy = evt != nullptr ? evt->byValue() : EvtParamVal();
+  Session& s = session_;
+  s.lancer([&s, name, copy]() mutable { s.appelerModule(name, &copy); });
+  callOutcome_ = 0;
+}
+
+int Automate::BoiteDialogue(const std::string& title, const std::string& text, int icon,
+                            const std::vector<std::string>& buttons) {
+  return session_.ui().boiteDialogue(title, text, icon, buttons);
+}
+
+std::string Automate::BoiteOuvrirFichier(const std::string& filter) {
+  auto chosen = session_.ui().choisirFichier("Sélection d'un fichier", filter);
+  return chosen ? *chosen : std::string();
+}
+
+Ecran& Automate::ecran() {
+  if (!ecran_) ecran_ = std::make_unique<Ecran>();
+  return *ecran_;
+}
+void Automate::autoriser(const std::string& c) { ecran().controle(c).actif = true; }
+void Automate::interdire(const std::string& c) { ecran().controle(c).actif = false; }
+void Automate::cacher(const std::string& c) { ecran().controle(c).visible = false; }
+void Automate::rendreVisible(const std::string& c) { ecran().controle(c).visible = true; }
+
+void Automate::executer(Evt* evt) {
+  for (const char* label : {"INIT", "DEBUT", "FAIRE"}) {
+    if (termine()) break;
+    raise(label, evt);
+  }
+  sortir();
+}
+
+}  // namespace quarvo::host

@@ -1,0 +1,69 @@
+#include "host/automate/Parcours.h"
+
+#include <algorithm>
+#include <optional>
+
+namespace quarvo::host {
+
+Parcours::Parcours(Evt* creating) : Automate(creating) {}
+Parcours::~Parcours() = default;
+
+void Parcours::plan(std::vector<std::string> sortColumns, std::string breakColumn) {
+  sort_ = std::move(sortColumns);
+  break_ = std::move(breakColumn);
+}
+
+void Parcours::critere(const std::string& column, char op, const Valeur& value) {
+  criteria_.push_back({column, op, value});
+}
+
+Table& Parcours::courant() {
+  if (!cursor_) cursor_ = std::make_unique<Table>(this, nomBase(), nomTable(), "PARCOURS");
+  return *cursor_;
+}
+
+void Parcours::executer(Evt* evt) {
+  EvtParamVal none;
+  Evt* e = evt != nullptr ? evt : &none;
+  for (const char* label : {"INIT", "DEBUT"}) {
+    if (termine()) break;
+    raise(label, e);
+  }
+  if (!termine() && !nomTable().empty()) {
+    Table& t = courant();
+    t.effacerCriteres();
+    for (const auto& c : criteria_) t.ajouterCritere(c.column, c.op, c.value);
+    t.ouvrir();
+    // The selection comes in key order; the sort plan orders it (stable: ties keep key order).
+    std::vector<std::pair<std::vector<Valeur>, RowId>> order;
+    while (t.lire(1) == 0) {
+      std::vector<Valeur> key;
+      for (const auto& col : sort_) key.push_back(t.valeur(col));
+      order.emplace_back(std::move(key), t.courantId());
+    }
+    std::stable_sort(order.begin(), order.end(), [](const auto& a, const auto& b) {
+      for (size_t i = 0; i < a.first.size(); ++i) {
+        int c = Valeur::compare(a.first[i], b.first[i]);
+        if (c != 0) return c < 0;
+      }
+      return false;
+    });
+    std::optional<Valeur> group;
+    for (const auto& [key, id] : order) {
+      if (termine() || stop_) break;
+      if (t.aller(id) != 0) continue;  // deleted since the selection was made
+      Valeur breakValue = break_.empty() ? Valeur() : t.valeur(break_);
+      if (!break_.empty() && (!group || Valeur::compare(*group, breakValue) != 0)) {
+        if (group) raise("FIN1", e);
+        group = breakValue;
+        raise("DEBUT1", e);
+      }
+      raise("POUR_TOUT", e);
+    }
+    if (group && !termine()) raise("FIN1", e);
+  }
+  if (!termine()) raise("FIN", e);
+  sortir();
+}
+
+}  // namespace quarvo::host

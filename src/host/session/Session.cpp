@@ -1,0 +1,103 @@
+#include "host/session/Session.h"
+
+#include "host/UException.h"
+#include "host/automate/Automate.h"
+
+namespace quarvo::host {
+
+namespace {
+thread_local Session* currentSession = nullptr;
+}
+
+Session::Session(Database& db, UiDriver& ui, std::string company, std::string user)
+    : db_(db), ui_(ui), company_(std::move(company)), user_(std::move(user)) {}
+
+Session::~Session() = default;
+
+Session& Session::current() {
+  if (currentSession == nullptr) throw UException("no session is open");
+  return *currentSession;
+}
+bool Session::hasCurrent() { return currentSession != nullptr; }
+
+Session::Scope::Scope(Session& s) : previous_(currentSession) { currentSession = &s; }
+Session::Scope::~Scope() { currentSession = previous_; }
+
+bool Session::isMemoryName(const std::string& name) {
+  return name.rfind("M_", 0) == 0 || name.rfind("MEM:", 0) == 0 || name.rfind("I_", 0) == 0;
+}
+
+MemoryStore& Session::memoire(const std::string& name) {
+  auto it = memory_.find(name);
+  if (it != memory_.end()) return *it->second;
+  // "I_AFLBUD" and "MEM:QUARVO" take the layout of the persistent table they mirror.
+  std::string mirrored;
+  if (name.rfind("I_", 0) == 0) mirrored = name.substr(2);
+  if (name.rfind("MEM:", 0) == 0) mirrored = name.substr(4);
+  std::unique_ptr<MemoryStore> store;
+  TableStore* persistent = mirrored.empty() ? nullptr : db_.store(mirrored);
+  if (persistent != nullptr) {
+    store = std::make_unique<MemoryStore>(name, persistent->schema());
+  } else {
+    store = std::make_unique<MemoryStore>(name);
+  }
+  return *memory_.emplace(name, std::move(store)).first->second;
+}
+
+TableStore* Session::store(const std::string& table) {
+  if (isMemoryName(table)) return &memoire(table);
+  return db_.store(table);
+}
+
+AutomatePtr Session::creer(const std::string& name, Evt* evt) {
+  Fabrique factory = Registry::instance().find(name);
+  if (factory == nullptr) return nullptr;
+  Scope scope(*this);
+  AutomatePtr automate(factory(evt));
+  if (automate) automate->setNomAutomate(name);
+  return automate;
+}
+
+int Session::appelerModule(const std::string& name, Evt* evt) {
+  AutomatePtr automate = creer(name, evt);
+  if (!automate) {
+    ui_.incident("Le traitement " + name + " n'est pas disponible dans cette version.");
+    return 1;
+  }
+  Scope scope(*this);
+  automate->executer(evt);
+  return automate->outcome();
+}
+
+int Session::appelerProcedure(const std::string& module, const std::string& label, Evt* evt) {
+  AutomatePtr automate = creer(module + "-INTERFACE", nullptr);
+  if (!automate) {
+    ui_.incident("Le module " + module + " n'est pas disponible.");
+    return 1;
+  }
+  Scope scope(*this);
+  EvtParamVal none;
+  Evt* e = evt != nullptr ? evt : &none;
+  if (automate->hasBranch("INIT")) automate->raise("INIT", e);
+  if (!automate->raise(label, e)) {
+    ui_.incident("La procédure " + label + " n'existe pas dans le module " + module + ".");
+    return 1;
+  }
+  return e->erreur();
+}
+
+void Session::lancer(std::function<void()> work) { pending_.push_back(std::move(work)); }
+
+void Session::executerEnAttente() {
+  if (running_) return;  // the loop that is running will reach the new work
+  running_ = true;
+  Scope scope(*this);
+  while (!pending_.empty()) {
+    auto work = std::move(pending_.front());
+    pending_.pop_front();
+    work();
+  }
+  running_ = false;
+}
+
+}  // namespace quarvo::host

@@ -1,0 +1,135 @@
+#include "host/table/MemoryStore.h"
+
+#include <algorithm>
+
+namespace quarvo::host {
+
+ColKind colKindOfValue(Kind k) {
+  switch (k) {
+    case Kind::Entier:
+      return ColKind::Integer;
+    case Kind::Double:
+    case Kind::Simple:
+      return ColKind::Real;
+    case Kind::Monnaie:
+      return ColKind::Decimal;
+    case Kind::Date:
+      return ColKind::Date;
+    default:
+      return ColKind::Text;
+  }
+}
+
+bool matches(const Valeur& value, const Criterion& c) {
+  switch (c.op) {
+    case '/': {
+      std::string text = value.toChaine();
+      std::string prefix = c.value.toChaine();
+      return text.compare(0, prefix.size(), prefix) == 0;
+    }
+    case '+':
+      return Valeur::compare(value, c.value) >= 0;
+    case '-':
+      return Valeur::compare(value, c.value) <= 0;
+    default:
+      return Valeur::compare(value, c.value) == 0;
+  }
+}
+
+Valeur MemoryStore::cell(const Row& row, size_t i) const {
+  if (i < row.values.size()) return row.values[i];
+  return defaultOf(schema_.columns()[i].kind);
+}
+
+bool MemoryStore::rowMatches(const Row& row, const std::vector<Criterion>& criteria) const {
+  for (const auto& c : criteria) {
+    auto i = schema_.index(c.column);
+    Valeur v = i ? cell(row, *i) : Valeur();
+    if (!matches(v, c)) return false;
+  }
+  return true;
+}
+
+std::vector<RowId> MemoryStore::select(const std::vector<Criterion>& criteria) {
+  std::vector<RowId> ids;
+  for (const auto& [id, row] : rows_) {
+    if (rowMatches(row, criteria)) ids.push_back(id);
+  }
+  const auto& key = schema_.key();
+  if (!key.empty()) {
+    std::stable_sort(ids.begin(), ids.end(), [&](RowId a, RowId b) {
+      const Row& ra = rows_.at(a);
+      const Row& rb = rows_.at(b);
+      for (size_t k : key) {
+        int c = Valeur::compare(cell(ra, k), cell(rb, k));
+        if (c != 0) return c < 0;
+      }
+      return false;
+    });
+  }
+  return ids;
+}
+
+bool MemoryStore::fetch(RowId id, Row& out) {
+  auto it = rows_.find(id);
+  if (it == rows_.end()) return false;
+  out = it->second;
+  out.values.resize(schema_.columns().size());
+  for (size_t i = it->second.values.size(); i < out.values.size(); ++i) {
+    out.values[i] = defaultOf(schema_.columns()[i].kind);
+  }
+  return true;
+}
+
+RowId MemoryStore::insert(const Row& row) {
+  RowId id = next_++;
+  rows_.emplace(id, row);
+  return id;
+}
+
+void MemoryStore::update(RowId id, const Row& row) {
+  auto it = rows_.find(id);
+  if (it != rows_.end()) it->second = row;
+}
+
+void MemoryStore::remove(RowId id) { rows_.erase(id); }
+
+int64_t MemoryStore::removeAll(const std::vector<Criterion>& criteria) {
+  int64_t n = 0;
+  for (auto it = rows_.begin(); it != rows_.end();) {
+    if (rowMatches(it->second, criteria)) {
+      it = rows_.erase(it);
+      ++n;
+    } else {
+      ++it;
+    }
+  }
+  return n;
+}
+
+int64_t MemoryStore::count(const std::vector<Criterion>& criteria) {
+  int64_t n = 0;
+  for (const auto& [id, row] : rows_) n += rowMatches(row, criteria) ? 1 : 0;
+  return n;
+}
+
+void MemoryStore::setKey(const std::vector<std::string>& columns) {
+  std::vector<size_t> key;
+  for (const auto& c : columns) key.push_back(schema_.add({c, ColKind::Text}));
+  schema_.setKey(std::move(key));
+}
+
+Row& MemoryStore::firstRow() {
+  if (rows_.empty()) insert(Row{});
+  Row& row = rows_.begin()->second;
+  if (row.values.size() < schema_.columns().size()) {
+    size_t from = row.values.size();
+    row.values.resize(schema_.columns().size());
+    for (size_t i = from; i < row.values.size(); ++i) {
+      row.values[i] = defaultOf(schema_.columns()[i].kind);
+    }
+  }
+  return row;
+}
+
+}  // namespace quarvo::host

@@ -1,0 +1,371 @@
+#include "host/table/SqliteDatabase.h"
+
+#include <sqlite3.h>
+
+#include <algorithm>
+
+#include "host/UException.h"
+
+namespace quarvo::host {
+
+void Transaction::commit() {
+  if (done_) throw UException("transaction committed twice");
+  db_.commit();
+  done_ = true;
+}
+
+namespace {
+
+std::string sqlIdent(const std::string& identifier) {
+  std::string out = "\"";
+  for (char c : identifier) {
+    if (c == '"') out += '"';
+    out += c;
+  }
+  return out + "\"";
+}
+
+// RAII reset of a cached statement.
+struct Reset {
+  sqlite3_stmt* stmt;
+  ~Reset() {
+    sqlite3_reset(stmt);
+    sqlite3_clear_bindings(stmt);
+  }
+};
+
+}  // namespace
+
+// A persistent table of the SQLite database.
+class SqliteStore : public TableStore {
+ public:
+  SqliteStore(SqliteDatabase& db, std::string name) : db_(db), name_(std::move(name)) {
+    sqlite3_stmt* st = db_.prepare("SELECT name, type, pk FROM pragma_table_info(?)");
+    Reset reset{st};
+    sqlite3_bind_text(st, 1, name_.c_str(), -1, SQLITE_TRANSIENT);
+    std::vector<std::pair<int, size_t>> pk;
+    while (sqlite3_step(st) == SQLITE_ROW) {
+      std::string col = reinterpret_cast<const char*>(sqlite3_column_text(st, 0));
+      const unsigned char* type = sqlite3_column_text(st, 1);
+      size_t i = schema_.add({col, colKindFromDeclared(type ? reinterpret_cast<const char*>(type) : "")});
+      int k = sqlite3_column_int(st, 2);
+      if (k > 0) pk.emplace_back(k, i);
+    }
+    std::sort(pk.begin(), pk.end());
+    std::vector<size_t> key;
+    for (auto& [k, i] : pk) key.push_back(i);
+    schema_.setKey(key);
+    std::string cols;
+    std::string marks;
+    std::string sets;
+    for (const auto& c : schema_.columns()) {
+      if (!cols.empty()) {
+        cols += ", ";
+        marks += ", ";
+        sets += ", ";
+      }
+      cols += sqlIdent(c.name);
+      marks += "?";
+      sets += sqlIdent(c.name) + " = ?";
+    }
+    order_ = " ORDER BY ";
+    for (size_t i : key) order_ += sqlIdent(schema_.columns()[i].name) + ", ";
+    order_ += "rowid";
+    fetchSql_ = "SELECT " + cols + " FROM " + sqlIdent(name_) + " WHERE rowid = ?";
+    insertSql_ = "INSERT INTO " + sqlIdent(name_) + " (" + cols + ") VALUES (" + marks + ")";
+    updateSql_ = "UPDATE " + sqlIdent(name_) + " SET " + sets + " WHERE rowid = ?";
+  }
+
+  bool exists() const { return !schema_.columns().empty(); }
+  const std::string& name() const override { return name_; }
+  TableSchema& schema() override { return schema_; }
+  bool extensible() const override { return false; }
+
+  std::vector<RowId> select(const std::vector<Criterion>& criteria) override {
+    std::vector<Valeur> binds;
+    std::string sql = "SELECT rowid FROM " + sqlIdent(name_) + where(criteria, binds) + order_;
+    sqlite3_stmt* st = db_.prepare(sql);
+    Reset reset{st};
+    bindAll(st, binds, 1);
+    std::vector<RowId> ids;
+    int rc;
+    while ((rc = sqlite3_step(st)) == SQLITE_ROW) ids.push_back(sqlite3_column_int64(st, 0));
+    if (rc != SQLITE_DONE) db_.fail("select on " + name_);
+    return ids;
+  }
+
+  bool fetch(RowId id, Row& out) override {
+    sqlite3_stmt* st = db_.prepare(fetchSql_);
+    Reset reset{st};
+    sqlite3_bind_int64(st, 1, id);
+    int rc = sqlite3_step(st);
+    if (rc == SQLITE_DONE) return false;
+    if (rc != SQLITE_ROW) db_.fail("read of " + name_);
+    const auto& cols = schema_.columns();
+    out.values.resize(cols.size());
+    for (size_t i = 0; i < cols.size(); ++i) out.values[i] = readColumn(st, static_cast<int>(i), cols[i].kind);
+    return true;
+  }
+
+  RowId insert(const Row& row) override {
+    sqlite3_stmt* st = db_.prepare(insertSql_);
+    Reset reset{st};
+    bindRow(st, row);
+    step(st, "insert into " + name_);
+    return sqlite3_last_insert_rowid(db_.handle());
+  }
+
+  void update(RowId id, const Row& row) override {
+    sqlite3_stmt* st = db_.prepare(updateSql_);
+    Reset reset{st};
+    bindRow(st, row);
+    sqlite3_bind_int64(st, static_cast<int>(schema_.columns().size()) + 1, id);
+    step(st, "update of " + name_);
+  }
+
+  void remove(RowId id) override {
+    sqlite3_stmt* st = db_.prepare("DELETE FROM " + sqlIdent(name_) + " WHERE rowid = ?");
+    Reset reset{st};
+    sqlite3_bind_int64(st, 1, id);
+    step(st, "delete from " + name_);
+  }
+
+  int64_t removeAll(const std::vector<Criterion>& criteria) override {
+    std::vector<Valeur> binds;
+    sqlite3_stmt* st = db_.prepare("DELETE FROM " + sqlIdent(name_) + where(criteria, binds));
+    Reset reset{st};
+    bindAll(st, binds, 1);
+    step(st, "delete from " + name_);
+    return sqlite3_changes(db_.handle());
+  }
+
+  int64_t count(const std::vector<Criterion>& criteria) override {
+    std::vector<Valeur> binds;
+    sqlite3_stmt* st = db_.prepare("SELECT COUNT(*) FROM " + sqlIdent(name_) + where(criteria, binds));
+    Reset reset{st};
+    bindAll(st, binds, 1);
+    if (sqlite3_step(st) != SQLITE_ROW) db_.fail("count of " + name_);
+    return sqlite3_column_int64(st, 0);
+  }
+
+ private:
+  void step(sqlite3_stmt* st, const std::string& what) {
+    int rc = sqlite3_step(st);
+    if (rc == SQLITE_DONE) return;
+    if ((rc & 0xff) == SQLITE_CONSTRAINT) {
+      throw ConstraintError(what + ": " + sqlite3_errmsg(db_.handle()));
+    }
+    db_.fail(what);
+  }
+
+  std::string where(const std::vector<Criterion>& criteria, std::vector<Valeur>& binds) {
+    std::string sql;
+    for (const auto& c : criteria) {
+      auto i = schema_.index(c.column);
+      if (!i) throw UException("table " + name_ + " has no column " + c.column);
+      const ColumnInfo& col = schema_.columns()[*i];
+      sql += sql.empty() ? " WHERE " : " AND ";
+      std::string q = sqlIdent(col.name);
+      if (c.op == '/') {
+        std::string prefix = c.value.toChaine();
+        sql += "substr(" + q + ", 1, ?) = ?";
+        binds.push_back(Valeur::entier(static_cast<int64_t>(utf8Length(prefix))));
+        binds.push_back(Valeur::chaine(prefix));
+        continue;
+      }
+      const char* cmp = c.op == '+' ? " >= ?" : c.op == '-' ? " <= ?" : " = ?";
+      auto fitted = fitColumn(col, c.value);
+      if (col.kind == ColKind::Decimal && c.op != '=') {
+        sql += "CAST(" + q + " AS REAL)" + cmp;
+        binds.push_back(Valeur::dbl(fitted ? fitted->asMonnaie().toDouble() : 0.0));
+      } else if (col.kind == ColKind::Date) {
+        sql += "COALESCE(" + q + ", '')" + cmp;
+        binds.push_back(Valeur::chaine(fitted ? fitted->asDate().iso() : c.value.toChaine()));
+      } else {
+        sql += q + cmp;
+        binds.push_back(fitted ? storageForm(col.kind, *fitted) : c.value);
+      }
+    }
+    return sql;
+  }
+
+  static size_t utf8Length(const std::string& s) {
+    size_t n = 0;
+    for (unsigned char c : s) n += (c & 0xC0) != 0x80 ? 1 : 0;
+    return n;
+  }
+
+  static Valeur storageForm(ColKind k, const Valeur& v) {
+    switch (k) {
+      case ColKind::Decimal:
+        return Valeur::chaine(v.asMonnaie().text());
+      case ColKind::Date:
+        return Valeur::chaine(v.asDate().iso());
+      default:
+        return v;
+    }
+  }
+
+  void bindAll(sqlite3_stmt* st, const std::vector<Valeur>& values, int first) {
+    int i = first;
+    for (const auto& v : values) bindValue(st, i++, v);
+  }
+
+  static void bindValue(sqlite3_stmt* st, int i, const Valeur& v) {
+    switch (v.kind()) {
+      case Kind::Entier:
+        sqlite3_bind_int64(st, i, v.asEntier());
+        break;
+      case Kind::Double:
+        sqlite3_bind_double(st, i, v.asDouble());
+        break;
+      case Kind::Simple:
+        sqlite3_bind_double(st, i, v.asSimple());
+        break;
+      default: {
+        std::string text = v.toChaine();
+        sqlite3_bind_text(st, i, text.c_str(), static_cast<int>(text.size()), SQLITE_TRANSIENT);
+      }
+    }
+  }
+
+  void bindRow(sqlite3_stmt* st, const Row& row) {
+    const auto& cols = schema_.columns();
+    for (size_t i = 0; i < cols.size(); ++i) {
+      int n = static_cast<int>(i) + 1;
+      if (i >= row.values.size()) {
+        bindValue(st, n, storageForm(cols[i].kind, defaultOf(cols[i].kind)));
+        continue;
+      }
+      auto fitted = fitColumn(cols[i], row.values[i]);
+      if (!fitted) {
+        throw UException("value '" + row.values[i].toChaine() + "' does not fit column " + name_ +
+                         "." + cols[i].name);
+      }
+      bindValue(st, n, storageForm(cols[i].kind, *fitted));
+    }
+  }
+
+  static Valeur readColumn(sqlite3_stmt* st, int i, ColKind k) {
+    int type = sqlite3_column_type(st, i);
+    if (type == SQLITE_NULL) return defaultOf(k);
+    switch (k) {
+      case ColKind::Integer:
+        return Valeur::entier(sqlite3_column_int64(st, i));
+      case ColKind::Real:
+        return Valeur::dbl(sqlite3_column_double(st, i));
+      default:
+        break;
+    }
+    std::string text(reinterpret_cast<const char*>(sqlite3_column_text(st, i)),
+                     static_cast<size_t>(sqlite3_column_bytes(st, i)));
+    if (k == ColKind::Decimal) {
+      auto m = Monnaie::parse(text);
+      return Valeur::monnaie(m ? *m : Monnaie());
+    }
+    if (k == ColKind::Date) {
+      auto d = Date::parse(text);
+      return Valeur::date(d ? *d : Date());
+    }
+    return Valeur::chaine(std::move(text));
+  }
+
+  SqliteDatabase& db_;
+  std::string name_;
+  TableSchema schema_;
+  std::string order_;
+  std::string fetchSql_;
+  std::string insertSql_;
+  std::string updateSql_;
+};
+
+SqliteDatabase::SqliteDatabase(const std::filesystem::path& path, bool create) : path_(path) {
+  int flags = SQLITE_OPEN_READWRITE | (create ? SQLITE_OPEN_CREATE : 0);
+  if (sqlite3_open_v2(path.c_str(), &db_, flags, nullptr) != SQLITE_OK) {
+    std::string msg = db_ ? sqlite3_errmsg(db_) : "out of memory";
+    sqlite3_close(db_);
+    db_ = nullptr;
+    throw UException("cannot open database " + path.string() + ": " + msg);
+  }
+  sqlite3_busy_timeout(db_, 30000);
+  sqlite3_extended_result_codes(db_, 1);
+  execScript("PRAGMA journal_mode = WAL; PRAGMA synchronous = NORMAL; PRAGMA foreign_keys = OFF;");
+}
+
+SqliteDatabase::~SqliteDatabase() {
+  stores_.clear();
+  for (auto& [sql, st] : statements_) sqlite3_finalize(st);
+  while (depth_ > 0) rollback();
+  sqlite3_close(db_);
+}
+
+void SqliteDatabase::fail(const std::string& what) {
+  throw UException(what + ": " + sqlite3_errmsg(db_));
+}
+
+sqlite3_stmt* SqliteDatabase::prepare(const std::string& sql) {
+  auto it = statements_.find(sql);
+  if (it != statements_.end()) return it->second;
+  sqlite3_stmt* st = nullptr;
+  if (sqlite3_prepare_v2(db_, sql.c_str(), -1, &st, nullptr) != SQLITE_OK) fail("prepare " + sql);
+  statements_.emplace(sql, st);
+  return st;
+}
+
+TableStore* SqliteDatabase::store(const std::string& table) {
+  auto it = stores_.find(table);
+  if (it != stores_.end()) return it->second.get();
+  auto s = std::make_unique<SqliteStore>(*this, table);
+  if (!s->exists()) return nullptr;
+  return stores_.emplace(table, std::move(s)).first->second.get();
+}
+
+std::vector<std::string> SqliteDatabase::tableNames() {
+  std::vector<std::string> names;
+  sqlite3_stmt* st =
+      prepare("SELECT name FROM sqlite_master WHERE type = 'table' ORDER BY name");
+  Reset reset{st};
+  while (sqlite3_step(st) == SQLITE_ROW) {
+    names.emplace_back(reinterpret_cast<const char*>(sqlite3_column_text(st, 0)));
+  }
+  return names;
+}
+
+void SqliteDatabase::execScript(const std::string& sql) {
+  char* err = nullptr;
+  if (sqlite3_exec(db_, sql.c_str(), nullptr, nullptr, &err) != SQLITE_OK) {
+    std::string msg = err ? err : "unknown error";
+    sqlite3_free(err);
+    throw UException("database script failed: " + msg);
+  }
+}
+
+void SqliteDatabase::begin() {
+  if (depth_ == 0) {
+    execScript("BEGIN IMMEDIATE");
+  } else {
+    execScript("SAVEPOINT sp" + std::to_string(depth_));
+  }
+  ++depth_;
+}
+
+void SqliteDatabase::commit() {
+  if (depth_ == 0) throw UException("commit without a transaction");
+  --depth_;
+  execScript(depth_ == 0 ? std::string("COMMIT") : "RELEASE sp" + std::to_string(depth_));
+}
+
+void SqliteDatabase::rollback() {
+  if (depth_ == 0) return;
+  --depth_;
+  if (depth_ == 0) {
+    char* err = nullptr;
+    sqlite3_exec(db_, "ROLLBACK", nullptr, nullptr, &err);
+    sqlite3_free(err);
+  } else {
+    std::string sp = "sp" + std::to_string(depth_);
+    sqlite3_exec(db_, ("ROLLBACK TO " + sp + "; RELEASE " + sp).c_str(), nullptr, nullptr, nullptr);
+  }
+}
+
+}  // namespace quarvo::host

@@ -1,0 +1,83 @@
+// The storage contract behind every cursor: a named table of rows with typed columns.
+//
+// A store answers selections (rows matching criteria, in the table's key order), fetches rows by
+// their row id, and inserts, updates and deletes rows. Persistent tables live in a SQL database
+// (see Database); memory tables ("M_...", "MEM:...", interface records "I_...") live in the
+// session. Stores are owned by their database or session; cursors only borrow them.
+#pragma once
+
+#include <cstdint>
+#include <memory>
+#include <optional>
+#include <string>
+#include <unordered_map>
+#include <vector>
+
+#include "host/value/Valeur.h"
+
+namespace quarvo::host {
+
+// How a column stores its values. The kind decides conversions and the stored text form.
+enum class ColKind { Text, Integer, Real, Decimal, Date, Time, DecimalList, DateList };
+
+Kind valueKindOf(ColKind k);
+// Parses a declared SQL column type ("DECIMAL_TEXT", "INTEGER", ...) into its kind.
+ColKind colKindFromDeclared(const std::string& declared);
+
+struct ColumnInfo {
+  std::string name;
+  ColKind kind = ColKind::Text;
+};
+
+// The columns of one table, with a by-name index. Memory tables may grow it.
+class TableSchema {
+ public:
+  const std::vector<ColumnInfo>& columns() const { return columns_; }
+  std::optional<size_t> index(const std::string& column) const;
+  size_t add(ColumnInfo info);
+  const std::vector<size_t>& key() const { return key_; }
+  void setKey(std::vector<size_t> key) { key_ = std::move(key); }
+
+ private:
+  std::vector<ColumnInfo> columns_;
+  std::unordered_map<std::string, size_t> index_;
+  std::vector<size_t> key_;
+};
+
+// One row: values aligned with the schema's columns (missing trailing values read as defaults).
+struct Row {
+  std::vector<Valeur> values;
+};
+
+// A selection criterion: '=' equal, '+' from (>=), '-' up to (<=), '/' starts with.
+struct Criterion {
+  std::string column;
+  char op = '=';
+  Valeur value;
+};
+
+using RowId = int64_t;
+
+class TableStore {
+ public:
+  virtual ~TableStore() = default;
+  virtual const std::string& name() const = 0;
+  virtual TableSchema& schema() = 0;
+  // Memory tables accept unknown columns on write; persistent tables refuse them.
+  virtual bool extensible() const = 0;
+  // Row ids of the matching rows in the table's key order.
+  virtual std::vector<RowId> select(const std::vector<Criterion>& criteria) = 0;
+  virtual bool fetch(RowId id, Row& out) = 0;
+  virtual RowId insert(const Row& row) = 0;
+  virtual void update(RowId id, const Row& row) = 0;
+  virtual void remove(RowId id) = 0;
+  virtual int64_t removeAll(const std::vector<Criterion>& criteria) = 0;
+  virtual int64_t count(const std::vector<Criterion>& criteria) = 0;
+};
+
+// A value made to fit a column: converted to the column's kind, or nullopt when it does not.
+std::optional<Valeur> fitColumn(const ColumnInfo& col, const Valeur& v);
+// The default value of a column kind (empty text, 0, empty date, 0.00).
+Valeur defaultOf(ColKind k);
+
+}  // namespace quarvo::host

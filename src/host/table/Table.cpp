@@ -1,0 +1,181 @@
+#include "host/table/Table.h"
+
+#include "host/UException.h"
+#include "host/automate/Automate.h"
+#include "host/session/Session.h"
+#include "host/table/MemoryStore.h"
+
+namespace quarvo::host {
+
+Table::Table(Automate* owner, std::string base, std::string name, std::string context,
+             const char*, const char*, char, int)
+    : owner_(owner),
+      base_(std::move(base)),
+      name_(std::move(name)),
+      context_(std::move(context)),
+      isRecord_(name_.rfind("I_", 0) == 0) {
+  if (owner_ != nullptr) owner_->enregistrerTable(this);
+}
+
+Session& Table::session() { return owner_ != nullptr ? owner_->session() : Session::current(); }
+
+TableStore& Table::store() {
+  if (store_ == nullptr) {
+    store_ = session().store(name_);
+    if (store_ == nullptr) throw UException("unknown table " + name_);
+  }
+  return *store_;
+}
+
+std::filesystem::path Table::repSGBD() {
+  auto dir = Session::current().db().path().parent_path();
+  return dir.empty() ? std::filesystem::path(".") : dir;
+}
+
+void Table::effacerCriteres() {
+  criteria_.clear();
+  open_ = false;
+}
+
+void Table::ajouterCritere(const std::string& column, char op, const Valeur& value, char) {
+  criteria_.push_back({column, op, value});
+  open_ = false;
+}
+
+int Table::ouvrir() {
+  selection_ = store().select(criteria_);
+  open_ = true;
+  position_ = 0;
+  return selection_.empty() ? 1 : 0;
+}
+
+void Table::load(RowId id) {
+  current_ = id;
+  if (!store().fetch(id, buffer_)) current_ = 0;
+}
+
+int Table::aller(RowId id) {
+  load(id);
+  return current_ != 0 ? 0 : 1;
+}
+
+int Table::lire(int mode, char) {
+  if (isRecord_) return static_cast<MemoryStore&>(store()).size() > 0 ? 0 : 1;
+  if (!open_) ouvrir();
+  switch (mode) {
+    case 3:
+      position_ = 0;
+      break;
+    case 4:
+      if (selection_.empty()) {
+        current_ = 0;
+        return 1;
+      }
+      position_ = selection_.size() - 1;
+      break;
+    default:
+      break;
+  }
+  // Rows deleted by someone else since the selection was made are passed over.
+  while (position_ < selection_.size()) {
+    load(selection_[position_++]);
+    if (current_ != 0) return 0;
+  }
+  current_ = 0;
+  return 1;
+}
+
+int Table::chercher(int mode, const std::string& column, char op, const Valeur& value) {
+  effacerCriteres();
+  ajouterCritere(column, op, value);
+  return lire(mode);
+}
+
+void Table::preparer() {
+  current_ = 0;
+  const auto& cols = store().schema().columns();
+  buffer_.values.clear();
+  for (const auto& c : cols) buffer_.values.push_back(defaultOf(c.kind));
+}
+
+int Table::inserer() {
+  if (isRecord_) return 1;
+  try {
+    current_ = store().insert(buffer_);
+  } catch (const ConstraintError&) {
+    return 1;
+  }
+  return 0;
+}
+
+int Table::modifier() {
+  if (isRecord_) return 0;
+  if (current_ == 0) return 1;
+  try {
+    store().update(current_, buffer_);
+  } catch (const ConstraintError&) {
+    return 1;
+  }
+  return 0;
+}
+
+int Table::supprimer(char) {
+  if (current_ == 0 || isRecord_) return 1;
+  store().remove(current_);
+  current_ = 0;
+  return 0;
+}
+
+int64_t Table::supprimerTout() {
+  if (isRecord_) {
+    auto& mem = static_cast<MemoryStore&>(store());
+    auto n = static_cast<int64_t>(mem.size());
+    mem.clear();
+    return n;
+  }
+  current_ = 0;
+  open_ = false;
+  return store().removeAll(criteria_);
+}
+
+int64_t Table::compter() { return store().count(criteria_); }
+
+const Row& Table::ligne() {
+  if (isRecord_) return static_cast<MemoryStore&>(store()).firstRow();
+  return buffer_;
+}
+
+Valeur Table::valeur(const std::string& column) {
+  TableStore& s = store();
+  auto i = s.schema().index(column);
+  if (!i) {
+    if (s.extensible()) return Valeur();
+    throw UException("table " + name_ + " has no column " + column);
+  }
+  const Row& row = ligne();
+  if (*i < row.values.size()) return row.values[*i];
+  return defaultOf(s.schema().columns()[*i].kind);
+}
+
+bool Table::ecrire(const std::string& column, const Valeur& value) {
+  TableStore& s = store();
+  auto i = s.schema().index(column);
+  if (!i) {
+    if (!s.extensible()) return false;
+    i = s.schema().add({column, colKindOfValue(value.kind())});
+  }
+  auto fitted = fitColumn(s.schema().columns()[*i], value);
+  if (!fitted) return false;
+  Row& row = isRecord_ ? static_cast<MemoryStore&>(s).firstRow() : buffer_;
+  if (row.values.size() <= *i) {
+    size_t from = row.values.size();
+    row.values.resize(s.schema().columns().size());
+    for (size_t k = from; k < row.values.size(); ++k) {
+      row.values[k] = defaultOf(s.schema().columns()[k].kind);
+    }
+  }
+  row.values[*i] = std::move(*fitted);
+  return true;
+}
+
+}  // namespace quarvo::host

@@ -1,0 +1,32 @@
+// The purchasing piece kinds: their tables, the component code they are linked under, their
+// type code in the chaining table and their group on the link document. One table, read by
+// every automaton that needs to tell kinds apart.
+#pragma once
+
+#include <array>
+#include <string_view>
+
+namespace quarvo::frame {
+
+struct PieceKind {
+  std::string_view code;       // "DF", "CF", "BF", "FF", or "" for time entries
+  std::string_view header;     // "GAPECOM"
+  std::string_view lines;      // "GAPLCOM"
+  std::string_view composant;  // the component in the link table ("" when never linked)
+  int typeCode;                // type code in "CHAINAGE" (0 when not used)
+  std::string_view group;      // group on the link document ("" when none)
+};
+
+inline constexpr std::array<PieceKind, 5> kPieceKinds{{
+    {"DF", "GAPEDEV", "GAPLDEV", "", -1, ""},
+    {"CF", "GAPECOM", "GAPLCOM", "GAPECOM", -2, "P1"},
+    {"BF", "GAPEBL", "GAPLBL", "GAPEBL", -3, "P2"},
+    {"FF", "GAPEFAC", "GAPLFAC", "GAPEFAC", -4, "P3"},
+    {"", "AFEFFO", "AFLFFO", "AFEFFO", 0, "P3"},
+}};
+
+// The kind whose header table or component is `name`; null when none.
+const PieceKind* kindOfTable(std::string_view name);
+const PieceKind* kindOfTypeCode(int typeCode);
+
+}  // namespace quarvo::frame

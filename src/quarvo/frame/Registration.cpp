@@ -1,0 +1,51 @@
+// The module's registration records, in the order the runtime receives them: the crash-flag
+// global first, then per source unit a Global record, its automata and a Source record. Units
+// group the automata by subsystem; the interface unit registers its globals under "QUARVO",
+// every other unit under "COMMUN". Automata join their unit as they are built.
+#include "host/automate/Automate.h"
+#include "host/automate/Registry.h"
+#include "quarvo/links/QUARVOExiste_chainage_aval.h"
+
+namespace quarvo {
+namespace {
+
+using host::fabriquer;
+using host::Global;
+using host::Module;
+using host::Source;
+using host::VariableGlobale;
+
+const VariableGlobale crashFlag("$$|VCODECRASHFLAG", "", "", 2, "CRASHFLAG");
+
+// Unit A: accounting analysis.
+const Global globalA("COMMUN", "QUARVO");
+const Source sourceA("QUARVO", nullptr);
+
+// Unit B: cancellation.
+const Global globalB("COMMUN", "QUARVO");
+const Source sourceB("QUARVO", nullptr);
+
+// Unit C: link document and downstream chaining lookup.
+const Global globalC("COMMUN", "QUARVO");
+const Module existeChainageAval("", "QUARVO-EXISTE_CHAINAGE_AVAL",
+                                &fabriquer<QUARVOExiste_chainage_aval>, false, "");
+const Source sourceC("QUARVO", nullptr);
+
+// Unit D: follow-up report.
+const Global globalD("COMMUN", "QUARVO");
+const Source sourceD("QUARVO", nullptr);
+
+// Unit E: import and settling.
+const Global globalE("COMMUN", "QUARVO");
+const Source sourceE("QUARVO", nullptr);
+
+// Unit F: imputation and pointing.
+const Global globalF("COMMUN", "QUARVO");
+const Source sourceF("QUARVO", nullptr);
+
+// Unit G: interface.
+const Global globalG("QUARVO", "QUARVO");
+const Source sourceG("QUARVO", nullptr);
+
+}  // namespace
+}  // namespace quarvo

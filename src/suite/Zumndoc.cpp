@@ -1,0 +1,104 @@
+#include "suite/Zumndoc.h"
+
+#include <charconv>
+
+#include "host/session/Session.h"
+#include "host/table/Table.h"
+
+namespace quarvo::suite {
+
+using namespace host;
+
+namespace {
+bool isNumber(const std::string& s, int64_t& out) {
+  if (s.empty()) return false;
+  auto [p, ec] = std::from_chars(s.data(), s.data() + s.size(), out);
+  return ec == std::errc() && p == s.data() + s.size();
+}
+
+std::string padded(int64_t n, int width) {
+  std::string digits = std::to_string(n);
+  if (static_cast<int>(digits.size()) < width) {
+    digits.insert(0, static_cast<size_t>(width) - digits.size(), '0');
+  }
+  return digits;
+}
+}  // namespace
+
+Zumndoc::Zumndoc(Evt* evt) : Interface2(evt) {
+  addBranch("ATTRIBUE_NUMERO", [this](Evt* e) { attribuer(e); });
+  addBranch("VALIDE_NUMERO", [this](Evt* e) { valider(e); });
+}
+
+Zumndoc::Request Zumndoc::parse(const Evt* evt) {
+  Request r;
+  for (int i = 0; i + 1 < evt->nbParams(); ++i) {
+    std::string v = evt->valeur(i).toChaine();
+    int64_t n = 0;
+    if (isNumber(v, n)) {
+      r.width = static_cast<int>(n);
+    } else if (v == "VOVOVA" || v == "GESCOM") {
+      r.base = v;
+    } else if (!v.empty() && v != "NUMEROS") {
+      r.table = v;
+    }
+  }
+  return r;
+}
+
+void Zumndoc::attribuer(Evt* evt) {
+  Request r = parse(evt);
+  Field& ident = chaine("P_IDENT");
+  evt->param(evt->nbParams() - 1, ident, 1);
+  if (r.table.empty() || r.width <= 0 || r.width > 18) {
+    erreurMethode(1, evt);
+    return;
+  }
+  Transaction tx(session().db());
+  Table counter(this, r.base, "ZUMNDOC", "COMPTEUR");
+  counter.effacerCriteres();
+  counter.ajouterCritere("MODULE", '=', Valeur::chaine(r.table));
+  counter.ajouterCritere("NOM", '=', Valeur::chaine("NUMEROS"));
+  counter.ajouterCritere("BASE", '=', Valeur::chaine(r.base));
+  int64_t next = 1;
+  if (counter.lire(3) == 0) {
+    next = toEntier(counter.valeur("DERNIER")) + 1;
+    counter.ecrire("DERNIER", Valeur::entier(next));
+    counter.modifier();
+  } else {
+    // Start above what the table already holds, so no identifier is ever given twice.
+    Table numbered(this, r.base, r.table, "NUMEROTE");
+    if (numbered.store().schema().index("IDENT")) {
+      numbered.ouvrir();
+      while (numbered.lire(1) == 0) {
+        int64_t n = 0;
+        if (isNumber(numbered.valeur("IDENT").toChaine(), n) && n >= next) next = n + 1;
+      }
+    }
+    counter.preparer();
+    counter.ecrire("MODULE", Valeur::chaine(r.table));
+    counter.ecrire("NOM", Valeur::chaine("NUMEROS"));
+    counter.ecrire("BASE", Valeur::chaine(r.base));
+    counter.ecrire("DERNIER", Valeur::entier(next));
+    counter.inserer();
+  }
+  tx.commit();
+  ident.set(padded(next, r.width));
+  erreurMethode(0, evt);
+}
+
+void Zumndoc::valider(Evt* evt) {
+  Request r = parse(evt);
+  int64_t n = 0;
+  std::string given = evt->valeur(evt->nbParams() - 1).toChaine();
+  Table counter(this, r.base, "ZUMNDOC", "COMPTEUR");
+  counter.effacerCriteres();
+  counter.ajouterCritere("MODULE", '=', Valeur::chaine(r.table));
+  counter.ajouterCritere("NOM", '=', Valeur::chaine("NUMEROS"));
+  counter.ajouterCritere("BASE", '=', Valeur::chaine(r.base));
+  bool known = isNumber(given, n) && counter.lire(3) == 0 && n >= 1 &&
+               n <= toEntier(counter.valeur("DERNIER"));
+  erreurMethode(known ? 0 : 1, evt);
+}
+
+}  // namespace quarvo::suite
