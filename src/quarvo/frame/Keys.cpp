@@ -7,13 +7,8 @@ std::string cleCompo(const std::string& aflbudIdent, const std::string& composan
   return aflbudIdent + "|" + composant + "|" + piece;
 }
 
-std::string prefixeCleCompo2(const std::string& composant, const std::string& composantIdent) {
+std::string cleCompo2(const std::string& composant, const std::string& composantIdent) {
   return composant + "|" + composantIdent + "|";
-}
-
-std::string cleCompo2(const std::string& composant, const std::string& composantIdent,
-                      const std::string& aflbudIdent) {
-  return prefixeCleCompo2(composant, composantIdent) + aflbudIdent;
 }
 
 std::string cleChainageSource(int64_t type, const std::string& ident) {
