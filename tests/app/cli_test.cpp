@@ -1,0 +1,117 @@
+// The quarvo command as a user runs it: exit codes, messages and what reaches the database.
+#include <gtest/gtest.h>
+
+#include <array>
+#include <cstdio>
+#include <filesystem>
+#include <fstream>
+#include <random>
+
+namespace {
+
+namespace fs = std::filesystem;
+
+struct Result {
+  int code;
+  std::string out;
+};
+
+class CliTest : public ::testing::Test {
+ protected:
+  void SetUp() override {
+    std::random_device rd;
+    dir_ = fs::temp_directory_path() / ("quarvo-cli-" + std::to_string(rd()));
+    fs::create_directories(dir_);
+    db_ = (dir_ / "q.db").string();
+  }
+  void TearDown() override { fs::remove_all(dir_); }
+
+  // Runs quarvo with `args`; stdout and stderr together.
+  Result quarvo(const std::string& args) {
+    std::string cmd = std::string("QUARVO_DATA_DIR=") + QUARVO_SOURCE_DIR + "/db " +
+                      QUARVO_BINARY + " --db " + db_ + " " + args + " 2>&1";
+    FILE* p = popen(cmd.c_str(), "r");
+    std::string out;
+    std::array<char, 4096> buf{};
+    size_t n;
+    while ((n = fread(buf.data(), 1, buf.size(), p)) > 0) out.append(buf.data(), n);
+    int status = pclose(p);
+    return {WEXITSTATUS(status), out};
+  }
+  void write(const std::string& name, const std::string& text) {
+    std::ofstream(dir_ / name) << text;
+  }
+  fs::path dir_;
+  std::string db_;
+};
+
+TEST_F(CliTest, InitIsIdempotentAndRefusesForeignFiles) {
+  EXPECT_EQ(quarvo("dump AFLBUD").code, 2);  // no database yet
+  EXPECT_EQ(quarvo("init --demo").code, 0);
+  std::string before = quarvo("dump AFLBUD").out;
+  EXPECT_EQ(quarvo("init --demo").code, 0);
+  EXPECT_EQ(quarvo("dump AFLBUD").out, before);  // the demo is not seeded twice
+
+  std::ofstream(dir_ / "notes.txt") << "not a database";
+  db_ = (dir_ / "notes.txt").string();
+  Result r = quarvo("init");
+  EXPECT_EQ(r.code, 2);
+  EXPECT_NE(r.out.find("notes.txt"), std::string::npos);
+  std::ifstream in(dir_ / "notes.txt");
+  std::string content((std::istreambuf_iterator<char>(in)), std::istreambuf_iterator<char>());
+  EXPECT_EQ(content, "not a database");
+
+  db_ = (dir_ / "other.db").string();
+  std::string create = "sqlite3 " + db_ + " 'CREATE TABLE t(x)'";
+  ASSERT_EQ(system(create.c_str()), 0);
+  r = quarvo("init");
+  EXPECT_EQ(r.code, 2);
+  EXPECT_NE(r.out.find("not a QUARVO database"), std::string::npos);
+}
+
+TEST_F(CliTest, LoadAndDumpRoundTripAndBadLinesLoadNothing) {
+  ASSERT_EQ(quarvo("init").code, 0);
+  write("chain.tsv",
+        "CLE_SRC\tTYPE_DST\tIDE_DST\n-2|0000000001|1\t-3\tB\\twith tab\n-2|0000000002|1\t-4\tF\n");
+  Result r = quarvo("load CHAINAGE " + (dir_ / "chain.tsv").string());
+  EXPECT_EQ(r.code, 0) << r.out;
+  Result dump = quarvo("dump CHAINAGE");
+  EXPECT_NE(dump.out.find("B\\twith tab"), std::string::npos);
+  write("dump.tsv", dump.out);
+  ASSERT_EQ(quarvo("init").code, 0);
+  db_ = (dir_ / "second.db").string();
+  ASSERT_EQ(quarvo("init").code, 0);
+  ASSERT_EQ(quarvo("load CHAINAGE " + (dir_ / "dump.tsv").string()).code, 0);
+  EXPECT_EQ(quarvo("dump CHAINAGE").out, dump.out);
+  EXPECT_EQ(quarvo("dump CHAINAGE --where TYPE_DST=-4").out.find("B\\t"), std::string::npos);
+
+  write("bad.tsv", "CLE_SRC\tTYPE_DST\tIDE_DST\n-2|9|1\t-3\tX\n-2|9|2\ttrois\tY\n");
+  r = quarvo("load CHAINAGE " + (dir_ / "bad.tsv").string());
+  EXPECT_EQ(r.code, 2);
+  EXPECT_NE(r.out.find("bad.tsv:3: column TYPE_DST: 'trois'"), std::string::npos) << r.out;
+  EXPECT_EQ(quarvo("dump CHAINAGE").out, dump.out);  // line 2 was not kept either
+
+  write("unknown.tsv", "CLE_SRC\tNOPE\n");
+  r = quarvo("load CHAINAGE " + (dir_ / "unknown.tsv").string());
+  EXPECT_EQ(r.code, 2);
+  EXPECT_NE(r.out.find("no column 'NOPE'"), std::string::npos);
+  EXPECT_EQ(quarvo("load NOTABLE " + (dir_ / "unknown.tsv").string()).code, 2);
+}
+
+TEST_F(CliTest, RunPrintsResultsAndOutcome) {
+  ASSERT_EQ(quarvo("init --demo").code, 0);
+  Result found = quarvo("run QUARVO-EXISTE_CHAINAGE_AVAL -2 0000000401 0 \"\"");
+  EXPECT_EQ(found.code, 0);
+  EXPECT_NE(found.out.find("2=-3\n3=0000000501\noutcome: ok"), std::string::npos) << found.out;
+  Result none = quarvo("run QUARVO-EXISTE_CHAINAGE_AVAL -2 0000099999 5 x");
+  EXPECT_EQ(none.code, 1);
+  EXPECT_NE(none.out.find("2=0\n3=\noutcome: failed"), std::string::npos) << none.out;
+  Result bad = quarvo("run QUARVO-EXISTE_CHAINAGE_AVAL deux 1 0 \"\"");
+  EXPECT_EQ(bad.code, 2);
+  EXPECT_NE(bad.out.find("parameter 0 ('deux')"), std::string::npos);
+  EXPECT_EQ(quarvo("run QUARVO-NOTHING").code, 2);
+  EXPECT_EQ(quarvo("call NOMODULE LECTURE 1").code, 2);
+  EXPECT_EQ(quarvo("automata").out.find("QUARVO-EXISTE_CHAINAGE_AVAL"), 0u);
+}
+
+}  // namespace
