@@ -115,8 +115,10 @@ class Automate {
   void cacher(const std::string& control);
   void rendreVisible(const std::string& control);
 
-  // How the runtime drives an automaton of this base class from creation to end.
+  // How the runtime drives an automaton of this base class from creation to end. A window
+  // returns while it is still open; the session keeps it until it ends.
   virtual void executer(Evt* evt);
+  virtual bool estFenetre() const { return false; }
 
   // Standard operations reached through their labels.
   virtual void init(Evt*) {}

@@ -66,7 +66,22 @@ int Session::appelerModule(const std::string& name, Evt* evt) {
   }
   Scope scope(*this);
   automate->executer(evt);
-  return automate->outcome();
+  int outcome = automate->outcome();
+  if (automate->estFenetre() && !automate->termine()) windows_.push_back(std::move(automate));
+  return outcome;
+}
+
+Automate* Session::fenetre(const std::string& name) {
+  fenetresOuvertes();
+  for (auto it = windows_.rbegin(); it != windows_.rend(); ++it) {
+    if ((*it)->nomAutomate() == name) return it->get();
+  }
+  return nullptr;
+}
+
+size_t Session::fenetresOuvertes() {
+  std::erase_if(windows_, [](const AutomatePtr& w) { return w->termine(); });
+  return windows_.size();
 }
 
 int Session::appelerProcedure(const std::string& module, const std::string& label, Evt* evt) {

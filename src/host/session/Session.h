@@ -13,6 +13,7 @@
 #include <map>
 #include <memory>
 #include <string>
+#include <vector>
 
 #include "host/automate/Registry.h"
 #include "host/table/Database.h"
@@ -63,6 +64,11 @@ class Session {
   // Runs `label` of `module`'s interface automaton. Returns the outcome.
   int appelerProcedure(const std::string& module, const std::string& label, Evt* evt);
 
+  // Open windows (automata still running after their start), most recent last. A window that
+  // has ended is released the next time the session looks.
+  Automate* fenetre(const std::string& name);
+  size_t fenetresOuvertes();
+
   // Event loop: launched work runs in order when the loop is run, each item to its end.
   void lancer(std::function<void()> work);
   void executerEnAttente();
@@ -76,6 +82,7 @@ class Session {
   std::filesystem::path dataDir_ = "db";
   std::map<std::string, std::unique_ptr<MemoryStore>> memory_;
   std::deque<std::function<void()>> pending_;
+  std::vector<AutomatePtr> windows_;
   bool running_ = false;
 };
 
