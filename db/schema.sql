@@ -193,6 +193,7 @@ CREATE UNIQUE INDEX IF NOT EXISTS "UX_AFCRI5_CODE" ON "AFCRI5" ("CODE");
 
 -- Projects (owner: AFAFFA). The project code is also the analytical section code
 -- ("SECAN_CODE") quoted on purchasing pieces. Each grouping family has its code and IDENT.
+-- A project with a "DATE_CLOTURE" is closed: its section accepts no more pieces.
 CREATE TABLE IF NOT EXISTS "AFAFFA" (
     "IDENT"         TEXT NOT NULL PRIMARY KEY,
     "CODE"          TEXT,
@@ -200,6 +201,7 @@ CREATE TABLE IF NOT EXISTS "AFAFFA" (
     "DATE_CREATION" DATE_TEXT,
     "DATE_DEBUT"    DATE_TEXT,
     "DATE_FIN"      DATE_TEXT,
+    "DATE_CLOTURE"  DATE_TEXT,
     "AFCLIE_IDENT"  TEXT,
     "AFCLIE_CODE"   TEXT,
     "AFETAB_IDENT"  TEXT,

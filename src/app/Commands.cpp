@@ -6,8 +6,11 @@
 #include <deque>
 #include <fstream>
 #include <iostream>
+#include <optional>
 
+#include "app/AnalyseCommand.h"
 #include "app/Demo.h"
+#include "app/FiguresCommand.h"
 #include "app/Tsv.h"
 #include "app/Workspace.h"
 #include "host/UException.h"
@@ -100,6 +103,31 @@ int runCommandLine(int argc, char** argv, std::ostream& out, std::ostream& err) 
   call->add_option("LABEL", label, "Procedure label")->required();
   call->add_option("ARGS", params, "Positional parameters");
 
+  std::string pieceKind;
+  std::string pieceIdent;
+  auto* analyse = cli.add_subcommand(
+      "analyse", "Check that a purchasing piece can be carried into the accounting link");
+  auto* cancel = cli.add_subcommand("cancel", "Remove every link of one purchasing piece");
+  for (auto* sub : {analyse, cancel}) {
+    sub->add_option("KIND", pieceKind, "Piece kind: GAPECOM, GAPEBL, GAPEFAC or CF, BF, FF")
+        ->required();
+    sub->add_option("IDENT", pieceIdent, "Identifier or document number of the piece")->required();
+  }
+
+  std::string lineIdent;
+  auto* recompute =
+      cli.add_subcommand("recompute", "Recompute a budget line's figures from its links");
+  recompute->add_option("LINE", lineIdent, "Budget line identifier")->required();
+
+  std::optional<std::string> checkLine;
+  bool fix = false;
+  auto* check = cli.add_subcommand(
+      "check",
+      "Compare each budget line's committed and realised figures with its links (exit 1 when "
+      "some differ)");
+  check->add_option("--line", checkLine, "Only this budget line");
+  check->add_flag("--fix", fix, "Bring the differing lines in line, in one transaction");
+
   std::string demoDir = "quarvo-demo";
   auto* demo = cli.add_subcommand("demo", "Build a demo database and show what QUARVO does");
   demo->add_option("--dir", demoDir, "Folder to create afresh")->capture_default_str();
@@ -157,6 +185,10 @@ int runCommandLine(int argc, char** argv, std::ostream& out, std::ostream& err) 
       dumpTsv(session, table, filters, out);
       return 0;
     }
+    if (*analyse) return runAnalyse(session, pieceKind, pieceIdent, out);
+    if (*cancel) return runCancel(session, pieceKind, pieceIdent, out);
+    if (*recompute) return runRecompute(session, lineIdent, out);
+    if (*check) return runCheck(session, checkLine, fix, out);
     if (*run) {
       CallerFields caller(params);
       EvtParamRef evt(caller.args);

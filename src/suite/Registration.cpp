@@ -2,9 +2,19 @@
 // name "<MODULE>-INTERFACE". Table-backed modules share one implementation.
 #include "host/automate/Automate.h"
 #include "host/automate/Registry.h"
+#include "suite/Afaffa.h"
+#include "suite/Afmenu.h"
+#include "suite/Afmouv.h"
 #include "suite/Afpara.h"
+#include "suite/Afpfst.h"
+#include "suite/Afresu.h"
 #include "suite/Afsoci.h"
 #include "suite/Commun.h"
+#include "suite/Gcpcompt.h"
+#include "suite/Gcptva.h"
+#include "suite/Parametres.h"
+#include "suite/Sysascii.h"
+#include "suite/Sysdroit.h"
 #include "suite/TableInterface.h"
 #include "suite/Zumndoc.h"
 
@@ -19,10 +29,14 @@ const Module commun("", "COMMUN-INTERFACE", &fabriquer<Commun>, false, "");
 const Module afsoci("", "AFSOCI-INTERFACE", &fabriquer<Afsoci>, false, "");
 const Module afpara("", "AFPARA-INTERFACE", &fabriquer<Afpara>, false, "");
 const Module zumndoc("", "ZUMNDOC-INTERFACE", &fabriquer<Zumndoc>, false, "");
+const Module sysdroit("", "SYSDROIT-INTERFACE", &fabriquer<Sysdroit>, false, "");
+const Module afmenu("", "AFMENU-INTERFACE", &fabriquer<Afmenu>, false, "");
+const Module afresu("", "AFRESU-INTERFACE", &fabriquer<Afresu>, false, "");
+const Module afmouv("", "AFMOUV-INTERFACE", &fabriquer<Afmouv>, false, "");
+const Module afpfst("", "AFPFST-INTERFACE", &fabriquer<Afpfst>, false, "");
 
 #define QUARVO_TABLE_MODULE(NAME) \
   const Module table_##NAME("", #NAME "-INTERFACE", &fabriquer<TableInterface>, false, "")
-QUARVO_TABLE_MODULE(AFAFFA);
 QUARVO_TABLE_MODULE(AFEBUD);
 QUARVO_TABLE_MODULE(AFLBUD);
 QUARVO_TABLE_MODULE(AFPRES);
@@ -34,16 +48,8 @@ QUARVO_TABLE_MODULE(AFPERS);
 QUARVO_TABLE_MODULE(AFVOCA);
 QUARVO_TABLE_MODULE(AFEFFO);
 QUARVO_TABLE_MODULE(GCPARTIC);
-QUARVO_TABLE_MODULE(GCPFOUR);
-QUARVO_TABLE_MODULE(GCPSTE);
-QUARVO_TABLE_MODULE(GCPPARAM);
 QUARVO_TABLE_MODULE(SVCCIVIL);
 QUARVO_TABLE_MODULE(GAPAPPOR);
-QUARVO_TABLE_MODULE(GCPDEPOT);
-QUARVO_TABLE_MODULE(GAPEDEV);
-QUARVO_TABLE_MODULE(GAPECOM);
-QUARVO_TABLE_MODULE(GAPEBL);
-QUARVO_TABLE_MODULE(GAPEFAC);
 QUARVO_TABLE_MODULE(GAPLCOM);
 QUARVO_TABLE_MODULE(GAPLBL);
 QUARVO_TABLE_MODULE(GAPLFAC);
@@ -51,6 +57,36 @@ QUARVO_TABLE_MODULE(SYSAPPLI);
 QUARVO_TABLE_MODULE(SYSCOMPO);
 #undef QUARVO_TABLE_MODULE
 
+const Module afaffa("", "AFAFFA-INTERFACE", &fabriquer<Afaffa>, false, "");
+const Module gcpparam("", "GCPPARAM-INTERFACE", &fabriquer<Parametres>, false, "");
+const Module cpparam("", "CPPARAM-INTERFACE", &fabriquer<Parametres>, false, "");
+const Module gcpcompt("", "GCPCOMPT-INTERFACE", &fabriquer<Gcpcompt>, false, "");
+const Module gcptcfg("", "GCPTCFG-INTERFACE", &fabriquer<Gcpcompt>, false, "");
+const Module gcptva("", "GCPTVA-INTERFACE", &fabriquer<Gcptva>, false, "");
+const Module sysascii("", "SYSASCII-INTERFACE", &fabriquer<Sysascii>, false, "");
+const Module action("", "ACTION-INTERFACE", &fabriquer<TableInterface>, false, "");
+const Module afdroi("", "AFDROI-INTERFACE", &fabriquer<TableInterface>, false, "");
+const Module afetab("", "AFETAB-INTERFACE", &fabriquer<TableInterface>, false, "");
+const Module afrps1("", "AFRPS1-INTERFACE", &fabriquer<TableInterface>, false, "");
+const Module afrps2("", "AFRPS2-INTERFACE", &fabriquer<TableInterface>, false, "");
+const Module afcri1("", "AFCRI1-INTERFACE", &fabriquer<TableInterface>, false, "");
+const Module afcri2("", "AFCRI2-INTERFACE", &fabriquer<TableInterface>, false, "");
+const Module afcri3("", "AFCRI3-INTERFACE", &fabriquer<TableInterface>, false, "");
+const Module afcri4("", "AFCRI4-INTERFACE", &fabriquer<TableInterface>, false, "");
+const Module afcri5("", "AFCRI5-INTERFACE", &fabriquer<TableInterface>, false, "");
+// Purchasing: suppliers and settling, depots, item-supplier links, due dates, piece modules.
+const Module gcpfour("", "GCPFOUR-INTERFACE", &fabriquer<TableInterface>, false, "");
+const Module gcpstock("", "GCPSTOCK-INTERFACE", &fabriquer<TableInterface>, false, "");
+const Module gcpx("", "GCPX-INTERFACE", &fabriquer<TableInterface>, false, "");
+const Module gaplot("", "GAPLOT-INTERFACE", &fabriquer<TableInterface>, false, "");
+const Module gcpste("", "GCPSTE-INTERFACE", &fabriquer<TableInterface>, false, "");
+const Module gcpdepot("", "GCPDEPOT-INTERFACE", &fabriquer<TableInterface>, false, "");
+const Module gapartfo("", "GAPARTFO-INTERFACE", &fabriquer<TableInterface>, false, "");
+const Module gapech("", "GAPECH-INTERFACE", &fabriquer<TableInterface>, false, "");
+const Module gapedev("", "GAPEDEV-INTERFACE", &fabriquer<TableInterface>, false, "");
+const Module gapecom("", "GAPECOM-INTERFACE", &fabriquer<TableInterface>, false, "");
+const Module gapebl("", "GAPEBL-INTERFACE", &fabriquer<TableInterface>, false, "");
+const Module gapefac("", "GAPEFAC-INTERFACE", &fabriquer<TableInterface>, false, "");
 const host::Source source("SUITE", nullptr);
 
 }  // namespace

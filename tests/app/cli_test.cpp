@@ -111,7 +111,37 @@ TEST_F(CliTest, RunPrintsResultsAndOutcome) {
   EXPECT_NE(bad.out.find("parameter 0 ('deux')"), std::string::npos);
   EXPECT_EQ(quarvo("run QUARVO-NOTHING").code, 2);
   EXPECT_EQ(quarvo("call NOMODULE LECTURE 1").code, 2);
-  EXPECT_EQ(quarvo("automata").out.find("QUARVO-EXISTE_CHAINAGE_AVAL"), 0u);
+  EXPECT_NE(quarvo("automata").out.find("QUARVO-EXISTE_CHAINAGE_AVAL\n"), std::string::npos);
+}
+
+TEST_F(CliTest, CheckFindsAPlantedDriftAndFixRemovesIt) {
+  ASSERT_EQ(quarvo("init --demo").code, 0);
+  std::string link = "sqlite3 " + db_ +
+      " \"INSERT INTO QUARVO (IDENT, AFEBUD_IDENT, AFAFFA_IDENT, AFLBUD_IDENT, COMPOSANT, "
+      "COMPOSANT_IDENT, PIECE, DATE_PIECE, QTE, HT) VALUES ('0000005001', '0000000201', "
+      "'0000000011', '0000000211', 'GAPECOM', '0000000401', 'CF26000001', '2026-03-02', 1, "
+      "'250.00')\"";
+  ASSERT_EQ(system(link.c_str()), 0);
+  ASSERT_EQ(quarvo("recompute 0000000211").code, 0);
+  EXPECT_EQ(quarvo("check").code, 0);
+  std::string drift = "sqlite3 " + db_ +
+      " \"UPDATE AFLBUD SET VENG = '260.00', VREA = '5.00;5.00;5.00' WHERE IDENT = '0000000211'\"";
+  ASSERT_EQ(system(drift.c_str()), 0);
+  Result found = quarvo("check");
+  EXPECT_EQ(found.code, 1);
+  EXPECT_NE(found.out.find("0000000211  VENG     260.00  250.00      10.00"), std::string::npos)
+      << found.out;
+  EXPECT_NE(found.out.find("VREA[0]  5.00    0.00        5.00"), std::string::npos) << found.out;
+  EXPECT_EQ(quarvo("check --line 0000000211 --fix").code, 1);
+  EXPECT_EQ(quarvo("check").code, 0);
+  EXPECT_EQ(quarvo("check --line 0000009999").code, 2);
+
+  Result cancelled = quarvo("cancel CF CF26000001");
+  EXPECT_EQ(cancelled.code, 0) << cancelled.out;
+  EXPECT_NE(cancelled.out.find("0000000211   250.00            0.00"), std::string::npos)
+      << cancelled.out;
+  EXPECT_EQ(quarvo("check").code, 0);
+  EXPECT_EQ(quarvo("cancel XX 1").code, 2);
 }
 
 }  // namespace

@@ -131,6 +131,12 @@ class Automate {
   virtual void sortie(Evt*) {}
   virtual void validation(Evt*) {}
   virtual void gestion(Evt*) {}
+  // The waiting box of a long treatment (progress shown while it runs).
+  virtual void debut_attente(Evt*) {}
+  virtual void valeur_attente(Evt*) {}
+  virtual void fin_attente(Evt*) {}
+  virtual void stop_attente(Evt*) {}
+  virtual void abandon_attente(Evt*) {}
   // Reports a runtime exception caught in a handler (its label is in evt->adresseC()).
   virtual void exception(Evt* evt);
 

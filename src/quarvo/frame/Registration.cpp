@@ -4,7 +4,10 @@
 // every other unit under "COMMUN". Automata join their unit as they are built.
 #include "host/automate/Automate.h"
 #include "host/automate/Registry.h"
+#include "quarvo/analysis/QUARVOAnalyser.h"
+#include "quarvo/analysis/QUARVOAnnuler1.h"
 #include "quarvo/links/QUARVOExiste_chainage_aval.h"
+#include "quarvo/links/QUARVOInterface.h"
 
 namespace quarvo {
 namespace {
@@ -19,10 +22,12 @@ const VariableGlobale crashFlag("$$|VCODECRASHFLAG", "", "", 2, "CRASHFLAG");
 
 // Unit A: accounting analysis.
 const Global globalA("COMMUN", "QUARVO");
+const Module analyser("", "QUARVO-ANALYSER", &fabriquer<QUARVOAnalyser>, false, "");
 const Source sourceA("QUARVO", nullptr);
 
 // Unit B: cancellation.
 const Global globalB("COMMUN", "QUARVO");
+const Module annuler1("", "QUARVO-ANNULER1", &fabriquer<QUARVOAnnuler1>, false, "");
 const Source sourceB("QUARVO", nullptr);
 
 // Unit C: link document and downstream chaining lookup.
@@ -45,6 +50,7 @@ const Source sourceF("QUARVO", nullptr);
 
 // Unit G: interface.
 const Global globalG("QUARVO", "QUARVO");
+const Module interface("", "QUARVO-INTERFACE", &fabriquer<QUARVOInterface>, false, "");
 const Source sourceG("QUARVO", nullptr);
 
 }  // namespace

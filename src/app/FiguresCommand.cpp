@@ -1,0 +1,171 @@
+#include "app/FiguresCommand.h"
+
+#include <ostream>
+#include <vector>
+
+#include "app/Console.h"
+#include "app/Workspace.h"
+#include "host/automate/Automate.h"
+#include "host/table/Champ.h"
+#include "host/table/Database.h"
+
+namespace quarvo::app {
+
+using namespace host;
+
+namespace {
+
+// Committed and realised figures of one budget line.
+struct Figures {
+  Monnaie veng;
+  Monnaie vrea[3];
+  bool operator==(const Figures&) const = default;
+};
+
+Figures read(const std::string& line) {
+  Table t(nullptr, "VOVOVA", "AFLBUD", "FIGURES");
+  if (t.chercher(3, "IDENT", '=', Valeur::chaine(line)) != 0) {
+    throw UsageError("no budget line has the identifier '" + line + "'");
+  }
+  Champ vrea("VREA", t);
+  return {toMonnaie(t.valeur("VENG")), {vrea.at(0), vrea.at(1), vrea.at(2)}};
+}
+
+int interfaceCall(Session& s, const std::string& label, const std::string& line) {
+  EvtParamVal evt{val(line)};
+  return s.appelerProcedure("QUARVO", label, &evt);
+}
+
+// What the line holds that its links do not explain.
+Figures drift(Session& s, const std::string& line) {
+  Transaction probe(s.db());  // rolled back: the audit changes nothing
+  if (interfaceCall(s, "SUPPRESSION_MAJ", line) != 0) {
+    throw UsageError("budget line '" + line + "' could not be read");
+  }
+  return read(line);
+}
+
+bool isZero(const Figures& f) {
+  return f.veng.isZero() && f.vrea[0].isZero() && f.vrea[1].isZero() && f.vrea[2].isZero();
+}
+
+// Withdraws the links, clears what remains, adds the links back.
+void recompute(Session& s, const std::string& line) {
+  Transaction tx(s.db());
+  if (interfaceCall(s, "SUPPRESSION_MAJ", line) != 0) {
+    throw UsageError("budget line '" + line + "' could not be read");
+  }
+  Table t(nullptr, "VOVOVA", "AFLBUD", "FIGURES");
+  t.chercher(3, "IDENT", '=', Valeur::chaine(line));
+  t.ecrire("VENG", Valeur::monnaie(Monnaie()));
+  t.ecrire("VREA", Valeur::chaine("0.00;0.00;0.00"));
+  t.modifier();
+  if (interfaceCall(s, "VALIDATION_MAJ", line) != 0) {
+    throw UsageError("budget line '" + line + "' could not be recomputed");
+  }
+  tx.commit();
+}
+
+const char* kFigureNames[] = {"VENG", "VREA[0]", "VREA[1]", "VREA[2]"};
+
+Monnaie figure(const Figures& f, size_t i) { return i == 0 ? f.veng : f.vrea[i - 1]; }
+
+std::vector<std::string> lines(const std::optional<std::string>& only) {
+  if (only) return {*only};
+  std::vector<std::string> all;
+  Table t(nullptr, "VOVOVA", "AFLBUD", "FIGURES");
+  t.ouvrir();
+  while (t.lire(1) == 0) all.push_back(t.valeur("IDENT").toChaine());
+  return all;
+}
+
+}  // namespace
+
+int runCheck(Session& s, const std::optional<std::string>& only, bool fix, std::ostream& out) {
+  Session::Scope scope(s);
+  std::vector<TextRow> rows;
+  std::vector<std::string> drifting;
+  for (const auto& line : lines(only)) {
+    Figures stored = read(line);
+    Figures extra = drift(s, line);
+    if (isZero(extra)) continue;
+    drifting.push_back(line);
+    for (size_t i = 0; i < 4; ++i) {
+      if (figure(extra, i).isZero()) continue;
+      rows.push_back({line, kFigureNames[i], figure(stored, i).text(),
+                      (figure(stored, i) - figure(extra, i)).text(), figure(extra, i).text()});
+    }
+  }
+  if (drifting.empty()) {
+    out << "Every budget line checked matches its links.\n";
+    return 0;
+  }
+  out << drifting.size() << " budget line(s) differ from their links:\n";
+  printTable(out, {"Line", "Figure", "Stored", "Recomputed", "Difference"}, rows);
+  if (fix) {
+    // One transaction for the whole fix: either every line is brought in line or none.
+    Transaction tx(s.db());
+    for (const auto& line : drifting) recompute(s, line);
+    tx.commit();
+    out << "Fixed: ";
+    for (size_t i = 0; i < drifting.size(); ++i) out << (i ? ", " : "") << drifting[i];
+    out << " now match their links.\n";
+  }
+  return 1;
+}
+
+int runRecompute(Session& s, const std::string& line, std::ostream& out) {
+  Session::Scope scope(s);
+  Figures before = read(line);
+  recompute(s, line);
+  Figures after = read(line);
+  std::vector<TextRow> rows;
+  for (size_t i = 0; i < 4; ++i) {
+    rows.push_back({kFigureNames[i], figure(before, i).text(), figure(after, i).text()});
+  }
+  out << "Budget line " << line << " recomputed from its links:\n";
+  printTable(out, {"Figure", "Before", "After"}, rows);
+  return 0;
+}
+
+int runCancel(Session& s, const std::string& kind, const std::string& ident, std::ostream& out) {
+  Session::Scope scope(s);
+  PieceArg piece = findPiece(kind, ident);
+  std::vector<std::pair<std::string, Figures>> touched;
+  Table links(nullptr, "VOVOVA", "QUARVO", "ANNULATION");
+  links.ajouterCritere("COMPOSANT", '=', Valeur::chaine(piece.table));
+  links.ajouterCritere("COMPOSANT_IDENT", '=', Valeur::chaine(piece.ident));
+  links.ouvrir();
+  while (links.lire(1) == 0) {
+    std::string line = links.valeur("AFLBUD_IDENT").toChaine();
+    Table exists(nullptr, "VOVOVA", "AFLBUD", "EXISTE");
+    Figures f = exists.chercher(3, "IDENT", '=', Valeur::chaine(line)) == 0 ? read(line) : Figures{};
+    touched.emplace_back(line, f);
+  }
+  out << "Cancellation of " << piece.table << " " << piece.ident << " (" << piece.numero << ")\n";
+  if (touched.empty()) {
+    out << "The piece is linked to no budget line: nothing to cancel.\n";
+    return 0;
+  }
+  EvtParamVal evt{val(piece.table), val(piece.ident)};
+  if (s.appelerModule("QUARVO-ANNULER1", &evt) != 0) {
+    out << "The cancellation did not take place (see the message above).\n";
+    return 1;
+  }
+  std::vector<TextRow> rows;
+  for (const auto& [line, before] : touched) {
+    Table exists(nullptr, "VOVOVA", "AFLBUD", "EXISTE");
+    if (exists.chercher(3, "IDENT", '=', Valeur::chaine(line)) != 0) {
+      rows.push_back({line, "(budget line no longer exists)", "", "", ""});
+      continue;
+    }
+    Figures after = read(line);
+    rows.push_back({line, before.veng.text(), after.veng.text(), before.vrea[0].text(),
+                    after.vrea[0].text()});
+  }
+  printTable(out, {"Budget line", "Committed before", "after", "Realised before", "after"}, rows);
+  out << touched.size() << " link(s) removed.\n";
+  return 0;
+}
+
+}  // namespace quarvo::app

@@ -1,0 +1,30 @@
+// The budget-line figures from the command line: the audit of committed and realised figures
+// against the links behind them (`quarvo check`), their recompute (`quarvo recompute`), and the
+// cancellation of one piece's links (`quarvo cancel`).
+//
+// The audit uses the module's own withdraw path: inside a transaction that is rolled back, the
+// line's links are withdrawn ("SUPPRESSION_MAJ"); what the line still holds afterwards is the
+// drift, the part of its figures that no link explains. A fix withdraws the links, clears that
+// drift and adds the links back ("VALIDATION_MAJ"), all in one transaction.
+#pragma once
+
+#include <iosfwd>
+#include <optional>
+#include <string>
+
+#include "host/session/Session.h"
+
+namespace quarvo::app {
+
+// Prints the lines whose stored figures differ from their links (stored, recomputed,
+// difference); with `fix`, brings them in line and says what changed. Returns 0 when nothing
+// differed, 1 when something did.
+int runCheck(host::Session& session, const std::optional<std::string>& line, bool fix,
+             std::ostream& out);
+// Recomputes one budget line from its links; prints its figures before and after.
+int runRecompute(host::Session& session, const std::string& line, std::ostream& out);
+// Cancels every link of one piece and prints the budget lines it corrected.
+int runCancel(host::Session& session, const std::string& kind, const std::string& ident,
+              std::ostream& out);
+
+}  // namespace quarvo::app

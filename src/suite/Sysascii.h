@@ -1,0 +1,26 @@
+// "SYSASCII": text utilities of the suite.
+//
+// Rule: "REMPLACER" (text by reference, pattern, replacement) replaces every occurrence of the
+// pattern in the text, left to right, without rescanning what was put in (so a replacement
+// that contains the pattern does not loop). An empty pattern leaves the text as it is. It
+// always succeeds.
+#pragma once
+
+#include <string>
+
+#include "host/automate/Interface2.h"
+
+namespace quarvo::suite {
+
+class Sysascii : public host::Interface2 {
+ public:
+  explicit Sysascii(host::Evt* evt);
+
+  static std::string remplacer(const std::string& text, const std::string& pattern,
+                               const std::string& replacement);
+
+ private:
+  void remplacer(host::Evt* evt);
+};
+
+}  // namespace quarvo::suite
