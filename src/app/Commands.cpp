@@ -11,6 +11,7 @@
 #include "app/AnalyseCommand.h"
 #include "app/Demo.h"
 #include "app/FiguresCommand.h"
+#include "app/ImputeCommand.h"
 #include "app/Tsv.h"
 #include "app/Workspace.h"
 #include "host/UException.h"
@@ -128,6 +129,20 @@ int runCommandLine(int argc, char** argv, std::ostream& out, std::ostream& err) 
   check->add_option("--line", checkLine, "Only this budget line");
   check->add_flag("--fix", fix, "Bring the differing lines in line, in one transaction");
 
+  ImputeOptions imputeOptions;
+  auto* impute = cli.add_subcommand(
+      "impute",
+      "Impute purchasing pieces to budget lines: without options the automatic imputation, with "
+      "options a pointing of that selection then the imputation");
+  impute->add_option("--from", imputeOptions.from, "Lowest creation date (dd/mm/yyyy)");
+  impute->add_option("--to", imputeOptions.to, "Highest creation date (dd/mm/yyyy)");
+  impute->add_option("--kind", imputeOptions.kind, "T all, C orders, B receipts, F invoices");
+  impute->add_option("--numbers", imputeOptions.numbers, "Document numbers MIN:MAX");
+  impute->add_option("--project", imputeOptions.project, "Project code");
+  impute->add_flag("--arbitration", imputeOptions.arbitration,
+                   "First suitable budget line wins; a missing one is created");
+  impute->add_flag("--dry-run", imputeOptions.dryRun, "Point only and print the proposal");
+
   std::string demoDir = "quarvo-demo";
   auto* demo = cli.add_subcommand("demo", "Build a demo database and show what QUARVO does");
   demo->add_option("--dir", demoDir, "Folder to create afresh")->capture_default_str();
@@ -185,6 +200,7 @@ int runCommandLine(int argc, char** argv, std::ostream& out, std::ostream& err) 
       dumpTsv(session, table, filters, out);
       return 0;
     }
+    if (*impute) return runImpute(session, imputeOptions, out);
     if (*analyse) return runAnalyse(session, pieceKind, pieceIdent, out);
     if (*cancel) return runCancel(session, pieceKind, pieceIdent, out);
     if (*recompute) return runRecompute(session, lineIdent, out);

@@ -24,7 +24,7 @@ void Afpara::regroupementAchat(Evt* evt) {
   Table grouping(this, nomBase(), "AFREGACH", "REGROUPEMENT");
   grouping.effacerCriteres();
   grouping.ajouterCritere("CRITERE", '=', Valeur::entier(criterion));
-  grouping.ajouterCritere("CLE", '=', Valeur::chaine(key));
+  grouping.ajouterCritere("CLE_IDENT", '=', Valeur::chaine(key));
   if (grouping.lire(3) != 0) {
     erreurMethode(1, evt);
     return;

@@ -37,7 +37,10 @@ MemoryStore& Session::memoire(const std::string& name) {
   std::unique_ptr<MemoryStore> store;
   TableStore* persistent = mirrored.empty() ? nullptr : db_.store(mirrored);
   if (persistent != nullptr) {
-    store = std::make_unique<MemoryStore>(name, persistent->schema());
+    TableSchema layout = persistent->schema();
+    // An interface record is one row written in place: it has no key to keep in order.
+    if (name.rfind("I_", 0) == 0) layout.setKey({});
+    store = std::make_unique<MemoryStore>(name, layout);
   } else {
     store = std::make_unique<MemoryStore>(name);
   }

@@ -50,10 +50,47 @@ bool MemoryStore::rowMatches(const Row& row, const std::vector<Criterion>& crite
   return true;
 }
 
+std::string MemoryStore::indexText(const Row& row) const {
+  return cell(row, schema_.key().front()).toChaine();
+}
+
+void MemoryStore::indexAdd(RowId id, const Row& row) {
+  if (!schema_.key().empty()) index_.emplace(indexText(row), id);
+}
+
+void MemoryStore::indexRemove(RowId id, const Row& row) {
+  if (schema_.key().empty()) return;
+  auto [from, to] = index_.equal_range(indexText(row));
+  for (auto it = from; it != to; ++it) {
+    if (it->second == id) {
+      index_.erase(it);
+      return;
+    }
+  }
+}
+
 std::vector<RowId> MemoryStore::select(const std::vector<Criterion>& criteria) {
   std::vector<RowId> ids;
-  for (const auto& [id, row] : rows_) {
-    if (rowMatches(row, criteria)) ids.push_back(id);
+  const Criterion* indexed = nullptr;
+  if (!schema_.key().empty()) {
+    const std::string& first = schema_.columns()[schema_.key().front()].name;
+    for (const auto& c : criteria) {
+      if (c.column == first && (c.op == '=' || c.op == '/')) indexed = &c;
+    }
+  }
+  if (indexed != nullptr) {
+    std::string text = indexed->value.toChaine();
+    auto from = index_.lower_bound(text);
+    auto to = indexed->op == '=' ? index_.upper_bound(text) : index_.end();
+    for (auto it = from; it != to; ++it) {
+      if (indexed->op == '/' && it->first.compare(0, text.size(), text) != 0) break;
+      if (rowMatches(rows_.at(it->second), criteria)) ids.push_back(it->second);
+    }
+    std::sort(ids.begin(), ids.end());
+  } else {
+    for (const auto& [id, row] : rows_) {
+      if (rowMatches(row, criteria)) ids.push_back(id);
+    }
   }
   const auto& key = schema_.key();
   if (!key.empty()) {
@@ -84,20 +121,30 @@ bool MemoryStore::fetch(RowId id, Row& out) {
 RowId MemoryStore::insert(const Row& row) {
   RowId id = next_++;
   rows_.emplace(id, row);
+  indexAdd(id, row);
   return id;
 }
 
 void MemoryStore::update(RowId id, const Row& row) {
   auto it = rows_.find(id);
-  if (it != rows_.end()) it->second = row;
+  if (it == rows_.end()) return;
+  indexRemove(id, it->second);
+  it->second = row;
+  indexAdd(id, row);
 }
 
-void MemoryStore::remove(RowId id) { rows_.erase(id); }
+void MemoryStore::remove(RowId id) {
+  auto it = rows_.find(id);
+  if (it == rows_.end()) return;
+  indexRemove(id, it->second);
+  rows_.erase(it);
+}
 
 int64_t MemoryStore::removeAll(const std::vector<Criterion>& criteria) {
   int64_t n = 0;
   for (auto it = rows_.begin(); it != rows_.end();) {
     if (rowMatches(it->second, criteria)) {
+      indexRemove(it->first, it->second);
       it = rows_.erase(it);
       ++n;
     } else {
@@ -117,8 +164,12 @@ void MemoryStore::setKey(const std::vector<std::string>& columns) {
   std::vector<size_t> key;
   for (const auto& c : columns) key.push_back(schema_.add({c, ColKind::Text}));
   schema_.setKey(std::move(key));
+  index_.clear();
+  for (const auto& [id, row] : rows_) indexAdd(id, row);
 }
 
+// Interface records are written in place through this row; they carry no key, so no index
+// needs to follow.
 Row& MemoryStore::firstRow() {
   if (rows_.empty()) insert(Row{});
   Row& row = rows_.begin()->second;

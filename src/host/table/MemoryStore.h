@@ -36,7 +36,10 @@ class MemoryStore : public TableStore {
   void setKey(const std::vector<std::string>& columns);
   // The first row, created empty when the table has none (interface records are one row).
   Row& firstRow();
-  void clear() { rows_.clear(); }
+  void clear() {
+    rows_.clear();
+    index_.clear();
+  }
   size_t size() const { return rows_.size(); }
 
  private:
@@ -45,7 +48,14 @@ class MemoryStore : public TableStore {
 
   std::string name_;
   TableSchema schema_;
+  // Index of the first key column's text, when the table has a key: selections on that column
+  // ('=' or '/') read only the rows they need instead of the whole table.
+  void indexAdd(RowId id, const Row& row);
+  void indexRemove(RowId id, const Row& row);
+  std::string indexText(const Row& row) const;
+
   std::map<RowId, Row> rows_;
+  std::multimap<std::string, RowId> index_;
   RowId next_ = 1;
 };
 

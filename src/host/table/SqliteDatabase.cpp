@@ -167,10 +167,13 @@ class SqliteStore : public TableStore {
       sql += sql.empty() ? " WHERE " : " AND ";
       std::string q = sqlIdent(col.name);
       if (c.op == '/') {
+        // "Starts with" as a range, so that an index on the column serves it: every text that
+        // starts with the prefix sorts between the prefix and the prefix followed by the highest
+        // character (texts compare bytewise, and valid UTF-8 has no byte above F4).
         std::string prefix = c.value.toChaine();
-        sql += "substr(" + q + ", 1, ?) = ?";
-        binds.push_back(Valeur::entier(static_cast<int64_t>(utf8Length(prefix))));
+        sql += q + " >= ? AND " + q + " < ?";
         binds.push_back(Valeur::chaine(prefix));
+        binds.push_back(Valeur::chaine(prefix + "\xF4\x8F\xBF\xBF"));
         continue;
       }
       const char* cmp = c.op == '+' ? " >= ?" : c.op == '-' ? " <= ?" : " = ?";
@@ -187,12 +190,6 @@ class SqliteStore : public TableStore {
       }
     }
     return sql;
-  }
-
-  static size_t utf8Length(const std::string& s) {
-    size_t n = 0;
-    for (unsigned char c : s) n += (c & 0xC0) != 0x80 ? 1 : 0;
-    return n;
   }
 
   static Valeur storageForm(ColKind k, const Valeur& v) {

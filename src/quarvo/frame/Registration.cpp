@@ -6,6 +6,9 @@
 #include "host/automate/Registry.h"
 #include "quarvo/analysis/QUARVOAnalyser.h"
 #include "quarvo/analysis/QUARVOAnnuler1.h"
+#include "quarvo/imputation/QUARVOImputer_auto.h"
+#include "quarvo/imputation/QUARVOImputer_pieces.h"
+#include "quarvo/imputation/QUARVOPointer_pieces.h"
 #include "quarvo/links/QUARVOExiste_chainage_aval.h"
 #include "quarvo/links/QUARVOInterface.h"
 
@@ -46,6 +49,11 @@ const Source sourceE("QUARVO", nullptr);
 
 // Unit F: imputation and pointing.
 const Global globalF("COMMUN", "QUARVO");
+const Module imputerAuto("", "QUARVO-IMPUTER_AUTO", &fabriquer<QUARVOImputer_auto>, false, "");
+const Module imputerPieces("", "QUARVO-IMPUTER_PIECES", &fabriquer<QUARVOImputer_pieces>, false,
+                           "");
+const Module pointerPieces("", "QUARVO-POINTER_PIECES", &fabriquer<QUARVOPointer_pieces>, false,
+                           "");
 const Source sourceF("QUARVO", nullptr);
 
 // Unit G: interface.

@@ -1,0 +1,104 @@
+#include "quarvo/imputation/QUARVOImputer_pieces.h"
+
+#include "host/session/Session.h"
+#include "host/table/Database.h"
+#include "quarvo/frame/Appels.h"
+#include "quarvo/frame/Keys.h"
+
+namespace quarvo {
+
+using namespace host;
+using frame::appeler;
+
+QUARVOImputer_pieces::QUARVOImputer_pieces(Evt* evt)
+    : Traitmnt(evt),
+      vIdent_(chaine("V_IDENT")),
+      eappr_(this, "VOVOVA", "M_EAPPR", ""),
+      lappr_(this, "VOVOVA", "M_LAPPR", ""),
+      vappr_(this, "VOVOVA", "M_VAPPR", ""),
+      iAflbud_(this, "VOVOVA", "I_AFLBUD", ""),
+      iAfaffa_(this, "VOVOVA", "I_AFAFFA", ""),
+      quarvo_(this, "VOVOVA", "QUARVO", "") {
+  nomBase("VOVOVA");
+  nomTable("QUARVO");
+  addBranch("FAIRE", [this](Evt* e) { faire(e); });
+  addBranch("SUPPRESSION_MAJ_LIENS", [this](Evt* e) { suppression_maj_liens(e); });
+  addBranch("MAJ_QUARVO", [this](Evt* e) { maj_quarvo(e); });
+  addBranch("MAJ_LIENS", [this](Evt* e) { maj_liens(e); });
+}
+
+void QUARVOImputer_pieces::faire(Evt* evt) {
+  eappr_.effacerCriteres();
+  eappr_.ajouterCritere("IMPUTATION", '=', Valeur::chaine("O"));
+  eappr_.ouvrir();
+  while (eappr_.lire(1) == 0) {
+    // A piece is written whole or not at all: a run cut short leaves no half-linked piece
+    // that the next pointing would take for an unchanged one.
+    Transaction piece(session().db());
+    lappr_.chercher(3, "NUMERO", '/', Valeur::chaine(eappr_.valeur("IDENT").toChaine() + "|"));
+    lappr_.ouvrir();
+    while (lappr_.lire(1) == 0) {
+      std::string key = lappr_.valeur("COMPOSANT").toChaine() + "|" +
+                        lappr_.valeur("COMPOSANT_IDENT").toChaine();
+      vappr_.chercher(3, "IDENT", '=', Valeur::chaine(key));
+      vappr_.ouvrir();
+      while (vappr_.lire(1) == 0) {
+        if (toDouble(vappr_.valeur("QTE")) == 0) continue;
+        if (appeler(*this, "AFAFFA", "LECTURE", {vappr_.valeur("AFAFFA_IDENT")}) != 0) continue;
+        if (appeler(*this, "AFLBUD", "LECTURE", {vappr_.valeur("AFLBUD_IDENT")}) != 0) continue;
+        if (appeler(*this, "AFPRES", "LECTURE", {iAflbud_.valeur("AFPRES_IDENT")}) != 0) continue;
+        appelerProcedure("", "", "", "SUPPRESSION_MAJ_LIENS", evt, 0);
+        appelerProcedure("", "", "", "MAJ_QUARVO", evt, 0);
+        appelerProcedure("", "", "", "MAJ_LIENS", evt, 0);
+      }
+    }
+    piece.commit();
+  }
+  erreurMethode(0, evt);
+  sortir(nullptr, 0);
+}
+
+// The withdraw and recompute around a write concern only the piece being written: the other
+// links of the budget line would be withdrawn and added back unchanged.
+void QUARVOImputer_pieces::suppression_maj_liens(Evt*) {
+  appeler(*this, "QUARVO", "SUPPRESSION_MAJ",
+          {iAflbud_.valeur("IDENT"), eappr_.valeur("COMPOSANT"), eappr_.valeur("COMPOSANT_IDENT")});
+}
+
+void QUARVOImputer_pieces::maj_liens(Evt*) {
+  appeler(*this, "QUARVO", "VALIDATION_MAJ",
+          {iAflbud_.valeur("IDENT"), eappr_.valeur("COMPOSANT"), eappr_.valeur("COMPOSANT_IDENT")});
+}
+
+void QUARVOImputer_pieces::maj_quarvo(Evt* evt) {
+  erreurMethode(0, evt);
+  std::string key = frame::cleCompo(vappr_.valeur("AFLBUD_IDENT").toChaine(),
+                                    eappr_.valeur("COMPOSANT").toChaine(),
+                                    eappr_.valeur("PIECE").toChaine());
+  if (quarvo_.chercher(3, "CLE_COMPO", '=', Valeur::chaine(key)) != 0) {
+    quarvo_.preparer();
+    vIdent_.set("");
+    std::vector<Arg> numbering{val("VOVOVA"), val("NUMEROS"), val("QUARVO"), val(""), val(10), ref(vIdent_)};
+    appeler(*this, "ZUMNDOC", "ATTRIBUE_NUMERO", numbering);
+    appeler(*this, "ZUMNDOC", "VALIDE_NUMERO", numbering);
+    quarvo_.ecrire("IDENT", vIdent_.value());
+    quarvo_.ecrire("AFEBUD_IDENT", vappr_.valeur("AFEBUD_IDENT"));
+    quarvo_.ecrire("AFAFFA_IDENT", vappr_.valeur("AFAFFA_IDENT"));
+    quarvo_.ecrire("AFLBUD_IDENT", vappr_.valeur("AFLBUD_IDENT"));
+    quarvo_.ecrire("AFAFFA_CODE", iAfaffa_.valeur("CODE"));
+    for (const char* column : {"COMPOSANT", "COMPOSANT_IDENT", "PIECE", "DATE_PIECE", "DATE_MAJ",
+                               "HEURE_MAJ"}) {
+      quarvo_.ecrire(column, eappr_.valeur(column));
+    }
+    // The database also derives the keys from the columns; written here all the same, so the key
+    // holds on any database.
+    quarvo_.ecrire("CLE_COMPO", Valeur::chaine(key));
+    quarvo_.inserer();
+  }
+  quarvo_.ecrire("QTE", Valeur::dbl(toDouble(quarvo_.valeur("QTE")) + toDouble(vappr_.valeur("QTE"))));
+  quarvo_.ecrire("HT", Valeur::monnaie(toMonnaie(quarvo_.valeur("HT")) + toMonnaie(vappr_.valeur("HT"))));
+  quarvo_.ecrire("QTT", Valeur::dbl(toDouble(quarvo_.valeur("QTT")) + toDouble(vappr_.valeur("QTT"))));
+  quarvo_.modifier();
+}
+
+}  // namespace quarvo

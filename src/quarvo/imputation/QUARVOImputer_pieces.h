@@ -1,0 +1,33 @@
+// "QUARVO-IMPUTER_PIECES": turns the pointing kept in the work tables ("M_EAPPR", "M_LAPPR",
+// "M_VAPPR") into link rows: one row per budget line, piece kind and piece number, adding up
+// the quantities and amounts of the piece's lines allocated to that budget line. Around each
+// write the budget line's figures are withdrawn and recomputed through the module's interface.
+// Pieces marked in error ("IMPUTATION" "N") and allocations without quantity write nothing.
+// Each piece is written whole or not at all, so an interrupted run can be run again.
+#pragma once
+
+#include "host/automate/Traitmnt.h"
+#include "host/table/Champ.h"
+
+namespace quarvo {
+
+class QUARVOImputer_pieces : public host::Traitmnt {
+ public:
+  explicit QUARVOImputer_pieces(host::Evt* evt);
+
+  void faire(host::Evt* evt) override;
+  void suppression_maj_liens(host::Evt* evt);
+  void maj_quarvo(host::Evt* evt);
+  void maj_liens(host::Evt* evt);
+
+ private:
+  host::Field& vIdent_;
+  host::Table eappr_;
+  host::Table lappr_;
+  host::Table vappr_;
+  host::Table iAflbud_;
+  host::Table iAfaffa_;
+  host::Table quarvo_;
+};
+
+}  // namespace quarvo
