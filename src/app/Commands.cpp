@@ -11,6 +11,7 @@
 #include "app/AnalyseCommand.h"
 #include "app/Demo.h"
 #include "app/FiguresCommand.h"
+#include "app/GenerateCommand.h"
 #include "app/ImputeCommand.h"
 #include "app/Tsv.h"
 #include "app/Workspace.h"
@@ -143,6 +144,16 @@ int runCommandLine(int argc, char** argv, std::ostream& out, std::ostream& err) 
                    "First suitable budget line wins; a missing one is created");
   impute->add_flag("--dry-run", imputeOptions.dryRun, "Point only and print the proposal");
 
+  GenerateOptions genOptions;
+  auto* gen = cli.add_subcommand(
+      "gen", "Add a synthetic data set (on a demo database) for benchmarks and large tests");
+  gen->add_option("--projects", genOptions.projects, "Projects, one budget each")
+      ->capture_default_str();
+  gen->add_option("--pieces", genOptions.pieces, "Supplier orders")->capture_default_str();
+  gen->add_option("--lines", genOptions.lines, "Lines per order")->capture_default_str();
+  gen->add_option("--services", genOptions.services, "Services, one budget line each per budget")
+      ->capture_default_str();
+
   std::string demoDir = "quarvo-demo";
   auto* demo = cli.add_subcommand("demo", "Build a demo database and show what QUARVO does");
   demo->add_option("--dir", demoDir, "Folder to create afresh")->capture_default_str();
@@ -200,6 +211,7 @@ int runCommandLine(int argc, char** argv, std::ostream& out, std::ostream& err) 
       dumpTsv(session, table, filters, out);
       return 0;
     }
+    if (*gen) return runGenerate(session, genOptions, out);
     if (*impute) return runImpute(session, imputeOptions, out);
     if (*analyse) return runAnalyse(session, pieceKind, pieceIdent, out);
     if (*cancel) return runCancel(session, pieceKind, pieceIdent, out);

@@ -38,8 +38,8 @@ void QUARVOImputer_pieces::faire(Evt* evt) {
     lappr_.chercher(3, "NUMERO", '/', Valeur::chaine(eappr_.valeur("IDENT").toChaine() + "|"));
     lappr_.ouvrir();
     while (lappr_.lire(1) == 0) {
-      std::string key = lappr_.valeur("COMPOSANT").toChaine() + "|" +
-                        lappr_.valeur("COMPOSANT_IDENT").toChaine();
+      std::string key =
+          lappr_.valeur("COMPOSANT").toChaine() + "|" + lappr_.valeur("COMPOSANT_IDENT").toChaine();
       vappr_.chercher(3, "IDENT", '=', Valeur::chaine(key));
       vappr_.ouvrir();
       while (vappr_.lire(1) == 0) {
@@ -72,13 +72,14 @@ void QUARVOImputer_pieces::maj_liens(Evt*) {
 
 void QUARVOImputer_pieces::maj_quarvo(Evt* evt) {
   erreurMethode(0, evt);
-  std::string key = frame::cleCompo(vappr_.valeur("AFLBUD_IDENT").toChaine(),
-                                    eappr_.valeur("COMPOSANT").toChaine(),
-                                    eappr_.valeur("PIECE").toChaine());
+  std::string key =
+      frame::cleCompo(vappr_.valeur("AFLBUD_IDENT").toChaine(),
+                      eappr_.valeur("COMPOSANT").toChaine(), eappr_.valeur("PIECE").toChaine());
   if (quarvo_.chercher(3, "CLE_COMPO", '=', Valeur::chaine(key)) != 0) {
     quarvo_.preparer();
     vIdent_.set("");
-    std::vector<Arg> numbering{val("VOVOVA"), val("NUMEROS"), val("QUARVO"), val(""), val(10), ref(vIdent_)};
+    std::vector<Arg> numbering{val("VOVOVA"), val("NUMEROS"), val("QUARVO"),
+                               val(""),       val(10),        ref(vIdent_)};
     appeler(*this, "ZUMNDOC", "ATTRIBUE_NUMERO", numbering);
     appeler(*this, "ZUMNDOC", "VALIDE_NUMERO", numbering);
     quarvo_.ecrire("IDENT", vIdent_.value());
@@ -86,8 +87,8 @@ void QUARVOImputer_pieces::maj_quarvo(Evt* evt) {
     quarvo_.ecrire("AFAFFA_IDENT", vappr_.valeur("AFAFFA_IDENT"));
     quarvo_.ecrire("AFLBUD_IDENT", vappr_.valeur("AFLBUD_IDENT"));
     quarvo_.ecrire("AFAFFA_CODE", iAfaffa_.valeur("CODE"));
-    for (const char* column : {"COMPOSANT", "COMPOSANT_IDENT", "PIECE", "DATE_PIECE", "DATE_MAJ",
-                               "HEURE_MAJ"}) {
+    for (const char* column :
+         {"COMPOSANT", "COMPOSANT_IDENT", "PIECE", "DATE_PIECE", "DATE_MAJ", "HEURE_MAJ"}) {
       quarvo_.ecrire(column, eappr_.valeur(column));
     }
     // The database also derives the keys from the columns; written here all the same, so the key
@@ -95,9 +96,12 @@ void QUARVOImputer_pieces::maj_quarvo(Evt* evt) {
     quarvo_.ecrire("CLE_COMPO", Valeur::chaine(key));
     quarvo_.inserer();
   }
-  quarvo_.ecrire("QTE", Valeur::dbl(toDouble(quarvo_.valeur("QTE")) + toDouble(vappr_.valeur("QTE"))));
-  quarvo_.ecrire("HT", Valeur::monnaie(toMonnaie(quarvo_.valeur("HT")) + toMonnaie(vappr_.valeur("HT"))));
-  quarvo_.ecrire("QTT", Valeur::dbl(toDouble(quarvo_.valeur("QTT")) + toDouble(vappr_.valeur("QTT"))));
+  quarvo_.ecrire("QTE",
+                 Valeur::dbl(toDouble(quarvo_.valeur("QTE")) + toDouble(vappr_.valeur("QTE"))));
+  quarvo_.ecrire("HT",
+                 Valeur::monnaie(toMonnaie(quarvo_.valeur("HT")) + toMonnaie(vappr_.valeur("HT"))));
+  quarvo_.ecrire("QTT",
+                 Valeur::dbl(toDouble(quarvo_.valeur("QTT")) + toDouble(vappr_.valeur("QTT"))));
   quarvo_.modifier();
 }
 

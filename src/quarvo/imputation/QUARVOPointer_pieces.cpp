@@ -2,6 +2,7 @@
 
 #include "host/Execute.h"
 #include "host/session/Session.h"
+#include "host/table/Database.h"
 #include "quarvo/frame/Appels.h"
 
 namespace quarvo {
@@ -22,9 +23,8 @@ namespace {
 
 const QUARVOPointer_pieces::Sorte kCommandes{"C", "GAPECOM", "GAPLCOM",
                                              "Traitement de la table GAPECOM", "No commande : "};
-const QUARVOPointer_pieces::Sorte kReceptions{"B", "GAPEBL", "GAPLBL",
-                                              "Traitement de la table GAPEBL",
-                                              "No bon de réception : "};
+const QUARVOPointer_pieces::Sorte kReceptions{
+    "B", "GAPEBL", "GAPLBL", "Traitement de la table GAPEBL", "No bon de réception : "};
 const QUARVOPointer_pieces::Sorte kFactures{"F", "GAPEFAC", "GAPLFAC",
                                             "Traitement de la table GAPEFAC", "No facture : "};
 
@@ -153,9 +153,15 @@ void QUARVOPointer_pieces::faire(Evt* evt) {
   sortir(nullptr, 0);
 }
 
-void QUARVOPointer_pieces::pointer_pieces_cf(Evt* evt) { pointerPieces(evt, kCommandes); }
-void QUARVOPointer_pieces::pointer_pieces_bf(Evt* evt) { pointerPieces(evt, kReceptions); }
-void QUARVOPointer_pieces::pointer_pieces_ff(Evt* evt) { pointerPieces(evt, kFactures); }
+void QUARVOPointer_pieces::pointer_pieces_cf(Evt* evt) {
+  pointerPieces(evt, kCommandes);
+}
+void QUARVOPointer_pieces::pointer_pieces_bf(Evt* evt) {
+  pointerPieces(evt, kReceptions);
+}
+void QUARVOPointer_pieces::pointer_pieces_ff(Evt* evt) {
+  pointerPieces(evt, kFactures);
+}
 
 void QUARVOPointer_pieces::pointerPieces(Evt* evt, const Sorte& sorte) {
   if (vTypePiece_.text() != "T" && vTypePiece_.text() != sorte.lettre) return;
@@ -177,74 +183,84 @@ void QUARVOPointer_pieces::pointerPieces(Evt* evt, const Sorte& sorte) {
   if (!vNumMax_.text().empty()) header.ajouterCritere("NUMERO_DOC", '-', vNumMax_.value(), 'A');
   vJauge2_.set(static_cast<double>(header.compter()));
   header.ouvrir();
-  bool option8 = iAfsoci_.valeur("OPTION8").toChaine() == "O";
   while (header.lire(1) == 0) {
-    appeler(*this, "COMMUN", "BOITE_AFFICHER_LIBELLE",
-            {val(std::string(sorte.libelle) + header.valeur("NUMERO_DOC").toChaine())});
-    vJauge1_.set(vJauge1_.dbl() + 1);
-    appeler(*this, "COMMUN", "BOITE_AFFICHER_JAUGE", {vJauge1_.value(), vJauge2_.value()});
-
-    if (!option8 && header.valeur("VALIDEE").toChaine() != "1") continue;
-    Date created = toDate(header.valeur("DATE_CREATION"));
-    if (!vDateFin_.date().empty() && vDateFin_.date() < created) continue;
-    std::string ident = header.valeur("IDENT").toChaine();
-    std::string headerProject = header.valeur("SECAN_CODE").toChaine();
-    if (!vAffaCode_.text().empty()) {
-      if (!headerProject.empty()) {
-        if (headerProject != vAffaCode_.text()) continue;
-      } else {
-        vFlag_.set(int64_t{0});
-        lignes_->chercher(3, "NUMERO", '/', Valeur::chaine(ident + "|"));
-        lignes_->ouvrir();
-        while (lignes_->lire(1) == 0) {
-          std::string code = lignes_->valeur("SECAN_CODE").toChaine();
-          if (!code.empty() && code == vAffaCode_.text()) {
-            vFlag_.set(int64_t{1});
-            break;
-          }
-        }
-        if (vFlag_.entier() == 0) continue;
-      }
-    }
-
-    // Linked before: unchanged since, nothing to do; changed, the old links go first.
-    quarvo2_.effacerCriteres();
-    quarvo2_.ajouterCritere("COMPOSANT", '=', Valeur::chaine(sorte.entete));
-    quarvo2_.ajouterCritere("COMPOSANT_IDENT", '=', Valeur::chaine(ident));
-    quarvo2_.verrouiller('E');
-    if (quarvo2_.lire(3) == 0) {
-      std::string linked = toDate(quarvo2_.valeur("DATE_MAJ")).text() + quarvo2_.valeur("HEURE_MAJ").toChaine();
-      std::string current = toDate(header.valeur("DATE_MAJ")).text() + header.valeur("HEURE_MAJ").toChaine();
-      if (linked == current) continue;
-      EvtParamVal cancel{quarvo2_.valeur("COMPOSANT"), quarvo2_.valeur("COMPOSANT_IDENT")};
-      appelerModule("", "QUARVO", "QUARVO-ANNULER1", &cancel);
-    }
-
-    vEtatPiece_.set("0");
-    appeler(*this, "QUARVO", "ANALYSER",
-            {val(sorte.entete), val(ident), val(1), val(""), ref(vEtatPiece_)});
-
-    if (!appelInterne("CREER_EAPPR", evt)) continue;
-    eappr_.inserer();
-
-    lignes_->chercher(3, "NUMERO", '/', Valeur::chaine(ident + "|"));
-    lignes_->ouvrir();
-    while (lignes_->lire(1) == 0) {
-      Valeur article = lignes_->valeur("GCPARTIC_IDENT");
-      if (article.toChaine().empty()) continue;
-      if (appeler(*this, "GCPARTIC", "LECTURE", {article}) != 0) continue;
-      prestation_.reset();
-      vSecanCode_.set(headerProject);
-      std::string lineProject = lignes_->valeur("SECAN_CODE").toChaine();
-      if (!lineProject.empty()) vSecanCode_.set(lineProject);
-      if (!appelInterne("CREER_LAPPR", evt)) continue;
-      lappr_.inserer();
-      appelerProcedure("", "", "", "POINTER_BUDGETS", evt, 0);
-      if (appelInterne("MODIFIER_LAPPR", evt)) lappr_.modifier();
-    }
-    if (appelInterne("MODIFIER_EAPPR", evt)) eappr_.modifier();
+    // One piece at a time, each in a transaction of its own: its cancellation, analysis and
+    // any budget line created for it are kept together, and reads need no lock of their own.
+    Transaction piece(session().db());
+    pointerPiece(evt, sorte, header);
+    piece.commit();
   }
   appeler(*this, "COMMUN", "BOITE_SORTIR");
+}
+
+void QUARVOPointer_pieces::pointerPiece(Evt* evt, const Sorte& sorte, Table& header) {
+  bool option8 = iAfsoci_.valeur("OPTION8").toChaine() == "O";
+  appeler(*this, "COMMUN", "BOITE_AFFICHER_LIBELLE",
+          {val(std::string(sorte.libelle) + header.valeur("NUMERO_DOC").toChaine())});
+  vJauge1_.set(vJauge1_.dbl() + 1);
+  appeler(*this, "COMMUN", "BOITE_AFFICHER_JAUGE", {vJauge1_.value(), vJauge2_.value()});
+
+  if (!option8 && header.valeur("VALIDEE").toChaine() != "1") return;
+  Date created = toDate(header.valeur("DATE_CREATION"));
+  if (!vDateFin_.date().empty() && vDateFin_.date() < created) return;
+  std::string ident = header.valeur("IDENT").toChaine();
+  std::string headerProject = header.valeur("SECAN_CODE").toChaine();
+  if (!vAffaCode_.text().empty()) {
+    if (!headerProject.empty()) {
+      if (headerProject != vAffaCode_.text()) return;
+    } else {
+      vFlag_.set(int64_t{0});
+      lignes_->chercher(3, "NUMERO", '/', Valeur::chaine(ident + "|"));
+      lignes_->ouvrir();
+      while (lignes_->lire(1) == 0) {
+        std::string code = lignes_->valeur("SECAN_CODE").toChaine();
+        if (!code.empty() && code == vAffaCode_.text()) {
+          vFlag_.set(int64_t{1});
+          break;
+        }
+      }
+      if (vFlag_.entier() == 0) return;
+    }
+  }
+
+  // Linked before: unchanged since, nothing to do; changed, the old links go first.
+  quarvo2_.effacerCriteres();
+  quarvo2_.ajouterCritere("COMPOSANT", '=', Valeur::chaine(sorte.entete));
+  quarvo2_.ajouterCritere("COMPOSANT_IDENT", '=', Valeur::chaine(ident));
+  quarvo2_.verrouiller('E');
+  if (quarvo2_.lire(3) == 0) {
+    std::string linked =
+        toDate(quarvo2_.valeur("DATE_MAJ")).text() + quarvo2_.valeur("HEURE_MAJ").toChaine();
+    std::string current =
+        toDate(header.valeur("DATE_MAJ")).text() + header.valeur("HEURE_MAJ").toChaine();
+    if (linked == current) return;
+    EvtParamVal cancel{quarvo2_.valeur("COMPOSANT"), quarvo2_.valeur("COMPOSANT_IDENT")};
+    appelerModule("", "QUARVO", "QUARVO-ANNULER1", &cancel);
+  }
+
+  vEtatPiece_.set("0");
+  appeler(*this, "QUARVO", "ANALYSER",
+          {val(sorte.entete), val(ident), val(1), val(""), ref(vEtatPiece_)});
+
+  if (!appelInterne("CREER_EAPPR", evt)) return;
+  eappr_.inserer();
+
+  lignes_->chercher(3, "NUMERO", '/', Valeur::chaine(ident + "|"));
+  lignes_->ouvrir();
+  while (lignes_->lire(1) == 0) {
+    Valeur article = lignes_->valeur("GCPARTIC_IDENT");
+    if (article.toChaine().empty()) continue;
+    if (appeler(*this, "GCPARTIC", "LECTURE", {article}) != 0) continue;
+    prestation_.reset();
+    vSecanCode_.set(headerProject);
+    std::string lineProject = lignes_->valeur("SECAN_CODE").toChaine();
+    if (!lineProject.empty()) vSecanCode_.set(lineProject);
+    if (!appelInterne("CREER_LAPPR", evt)) continue;
+    lappr_.inserer();
+    appelerProcedure("", "", "", "POINTER_BUDGETS", evt, 0);
+    if (appelInterne("MODIFIER_LAPPR", evt)) lappr_.modifier();
+  }
+  if (appelInterne("MODIFIER_EAPPR", evt)) eappr_.modifier();
 }
 
 void QUARVOPointer_pieces::creer_eappr(Evt* evt) {
@@ -388,7 +404,8 @@ void QUARVOPointer_pieces::creer_aflbud(Evt* evt) {
   }
   Field& ident = vAflbudIdent_;
   ident.set("");
-  std::vector<Arg> numbering{val("VOVOVA"), val("NUMEROS"), val("AFLBUD"), val(""), val(10), ref(ident)};
+  std::vector<Arg> numbering{val("VOVOVA"), val("NUMEROS"), val("AFLBUD"),
+                             val(""),       val(10),        ref(ident)};
   if (appeler(*this, "ZUMNDOC", "ATTRIBUE_NUMERO", numbering) != 0 ||
       appeler(*this, "ZUMNDOC", "VALIDE_NUMERO", numbering) != 0) {
     erreurMethode(1, evt);

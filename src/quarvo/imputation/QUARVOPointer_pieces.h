@@ -43,6 +43,7 @@ class QUARVOPointer_pieces : public host::Traitmnt {
 
  private:
   void pointerPieces(host::Evt* evt, const Sorte& sorte);
+  void pointerPiece(host::Evt* evt, const Sorte& sorte, host::Table& header);
   // A column of the current header or line of the kind being pointed, read by name.
   host::Valeur entete(const std::string& column);
   host::Valeur ligne(const std::string& column);
@@ -97,7 +98,7 @@ class QUARVOPointer_pieces : public host::Traitmnt {
   host::Table* entete_ = nullptr;
   host::Table* lignes_ = nullptr;
   std::optional<std::optional<std::string>> prestation_;  // cached per line
-  std::set<std::string> servicesLus_;                      // services known to exist
+  std::set<std::string> servicesLus_;                     // services known to exist
 };
 
 }  // namespace quarvo
