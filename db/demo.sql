@@ -548,3 +548,10 @@ INSERT INTO "ZUMNDOC" ("MODULE", "NOM", "BASE", "DERNIER") VALUES
     ('GAPEFAC', 'NUMERO_DOC', 'GESCOM', 3),
     ('GAPEFAC', 'NUMERO_AVOIR', 'GESCOM', 1);
 
+
+-- Remaining figures of the budget lines as their follow-up would compute them before any link:
+-- the whole budget remains.
+UPDATE "AFLBUD"
+   SET "VRAF" = "VBUD_D" || ';' || "VBUD_D" || ';' || "VBUD_D",
+       "HRAF" = MAX("HBUD" - "HREA", 0)
+ WHERE COALESCE("AFFECTE", 'N') <> 'O';

@@ -12,6 +12,7 @@
 #include "app/Demo.h"
 #include "app/FiguresCommand.h"
 #include "app/GenerateCommand.h"
+#include "app/ImportCommand.h"
 #include "app/ImputeCommand.h"
 #include "app/Tsv.h"
 #include "app/Workspace.h"
@@ -144,6 +145,9 @@ int runCommandLine(int argc, char** argv, std::ostream& out, std::ostream& err) 
                    "First suitable budget line wins; a missing one is created");
   impute->add_flag("--dry-run", imputeOptions.dryRun, "Point only and print the proposal");
 
+  ImportOptions importOptions;
+  auto* import = addImportCommand(cli, importOptions);
+
   GenerateOptions genOptions;
   auto* gen = cli.add_subcommand(
       "gen", "Add a synthetic data set (on a demo database) for benchmarks and large tests");
@@ -211,6 +215,7 @@ int runCommandLine(int argc, char** argv, std::ostream& out, std::ostream& err) 
       dumpTsv(session, table, filters, out);
       return 0;
     }
+    if (*import) return runImport(session, importOptions, out);
     if (*gen) return runGenerate(session, genOptions, out);
     if (*impute) return runImpute(session, imputeOptions, out);
     if (*analyse) return runAnalyse(session, pieceKind, pieceIdent, out);

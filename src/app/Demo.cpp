@@ -4,10 +4,17 @@
 
 #include <deque>
 #include <filesystem>
+#include <fstream>
 #include <ostream>
 
+#include "app/AnalyseCommand.h"
+#include "app/Console.h"
+#include "app/FiguresCommand.h"
+#include "app/ImportCommand.h"
+#include "app/ImputeCommand.h"
 #include "app/Workspace.h"
 #include "host/automate/Automate.h"
+#include "host/table/Champ.h"
 #include "host/table/Table.h"
 #include "host/ui/TerminalDriver.h"
 
@@ -18,21 +25,20 @@ namespace fs = std::filesystem;
 
 namespace {
 
-// A demo folder may be replaced only when it holds nothing but what a demo leaves there.
+// A demo folder may be replaced only when a demo made it (it holds the marker file) or it is
+// empty: a folder of the user's is never removed.
+constexpr const char* kMarker = ".quarvo-demo";
+
 void prepareFolder(const fs::path& dir) {
   if (fs::exists(dir)) {
     if (!fs::is_directory(dir)) throw UsageError(dir.string() + " exists and is not a folder");
-    bool ours = fs::exists(dir / "quarvo.db");
-    for (const auto& entry : fs::directory_iterator(dir)) {
-      std::string name = entry.path().filename().string();
-      if (name.rfind("quarvo", 0) != 0 && name.rfind("demo", 0) != 0) ours = false;
-    }
-    if (!ours && !fs::is_empty(dir)) {
+    if (!fs::exists(dir / kMarker) && !fs::is_empty(dir)) {
       throw UsageError(dir.string() + " exists and is not a QUARVO demo folder; choose --dir");
     }
     fs::remove_all(dir);
   }
   fs::create_directories(dir);
+  std::ofstream(dir / kMarker) << "made by quarvo demo; the folder is replaced by the next demo\n";
 }
 
 struct Lookup {
@@ -55,8 +61,8 @@ Lookup chainingOf(Session& s, const std::string& orderIdent) {
 std::string describe(Session&, const std::string& table, const std::string& ident) {
   Table t(nullptr, "GESCOM", table, "DEMO");
   if (t.chercher(3, "IDENT", '=', Valeur::chaine(ident)) != 0) return table + " " + ident;
-  return "no. " + t.valeur("NUMERO_DOC").toChaine() + " of " + t.valeur("DATE_CREATION").toChaine() +
-         " (identifier " + ident + ")";
+  return "no. " + t.valeur("NUMERO_DOC").toChaine() + " of " +
+         t.valeur("DATE_CREATION").toChaine() + " (identifier " + ident + ")";
 }
 
 const char* kindName(const std::string& typeCode) {
@@ -64,6 +70,24 @@ const char* kindName(const std::string& typeCode) {
   if (typeCode == "-4") return "supplier invoice";
   if (typeCode == "-2") return "supplier order";
   return "piece";
+}
+
+// Committed, realised and remaining figures of a project's budget lines.
+void printLines(std::ostream& out, const std::string& project) {
+  Table lines(nullptr, "VOVOVA", "AFLBUD", "DEMO");
+  lines.chercher(3, "AFAFFA_IDENT", '=', Valeur::chaine(project));
+  lines.ouvrir();
+  std::vector<TextRow> rows;
+  while (lines.lire(1) == 0) {
+    Champ vrea("VREA", lines);
+    Champ vraf("VRAF", lines);
+    rows.push_back({"   " + lines.valeur("IDENT").toChaine(), lines.valeur("DESIG").toChaine(),
+                    lines.valeur("VBUD_D").toChaine(), lines.valeur("VENG").toChaine(),
+                    vrea.at(0).text(), vraf.at(0).text(), lines.valeur("AVT").toChaine()});
+  }
+  printTable(
+      out, {"   Line", "Designation", "Budget", "Committed", "Realised", "Remaining", "Progress %"},
+      rows);
 }
 
 }  // namespace
@@ -89,7 +113,9 @@ int runDemo(const std::string& dirText, std::ostream& out, std::ostream& err) {
     Lookup l = chainingOf(s, ident);
     out << "   Order " << describe(s, "GAPECOM", ident) << ": ";
     if (l.outcome == 0) {
-      const auto* table = l.typeCible == "-3" ? "GAPEBL" : l.typeCible == "-4" ? "GAPEFAC" : "GAPECOM";
+      const auto* table = l.typeCible == "-3"   ? "GAPEBL"
+                          : l.typeCible == "-4" ? "GAPEFAC"
+                                                : "GAPECOM";
       out << "carried forward into " << kindName(l.typeCible) << " "
           << describe(s, table, l.identCible) << ".\n";
     } else {
@@ -97,10 +123,52 @@ int runDemo(const std::string& dirText, std::ostream& out, std::ostream& err) {
     }
     ++shown;
   }
-  out << "\nThe same lookup from the command line:\n"
-      << "   quarvo --db " << file.string() << " run QUARVO-EXISTE_CHAINAGE_AVAL -2 <order> 0 \"\"\n"
-      << "\nThe database stays in " << file.string() << "; look at it with for example\n"
-      << "   quarvo --db " << file.string() << " dump AFLBUD\n";
+  out << "   (from the command line: quarvo --db " << file.string()
+      << " run QUARVO-EXISTE_CHAINAGE_AVAL -2 <order> 0 \"\")\n";
+
+  out << "\n2. Can order CF26000001 be carried into the accounting link?\n";
+  runAnalyse(s, "CF", "CF26000001", out);
+
+  out << "\n3. Automatic imputation: every piece up to the end of the current month is pointed to\n"
+         "   the budget lines of its project, then linked.\n";
+  runImpute(s, ImputeOptions{}, out);
+  out << "   Budget lines of project AFF001 afterwards:\n";
+  printLines(out, "0000000011");
+
+  out << "\n4. Do the committed and realised figures match the links behind them?\n";
+  runCheck(s, std::nullopt, false, out);
+
+  out << "\n5. The credit note AV26000001 is withdrawn from its budget line:\n";
+  runCancel(s, "FF", "AV26000001", out);
+
+  out << "\n6. Import of purchase pieces from text files (samples with a few faulty lines):\n";
+  ImportOptions files;
+  for (auto [kind, target] :
+       {std::pair{"df", &files.df}, {"cf", &files.cf}, {"bf", &files.bf}, {"ff", &files.ff}}) {
+    fs::path sample = dataDir() / "demo" / (std::string(kind) + "_achats.txt");
+    fs::path copy = dir / sample.filename();
+    fs::copy_file(sample, copy, fs::copy_options::overwrite_existing);
+    *target = copy.string();
+  }
+  auto pieces = [] {
+    std::vector<int64_t> n;
+    for (const char* table : {"GAPEDEV", "GAPECOM", "GAPEBL", "GAPEFAC"}) {
+      Table t(nullptr, "GESCOM", table, "DEMO");
+      n.push_back(t.compter());
+    }
+    return n;
+  };
+  auto before = pieces();
+  runImport(s, files, out);
+  auto after = pieces();
+  out << "   The faulty pieces above were refused; the sound ones were created and linked: "
+      << after[0] - before[0] << " quote request(s), " << after[1] - before[1] << " order(s), "
+      << after[2] - before[2] << " goods-received note(s), " << after[3] - before[3]
+      << " invoice(s).\n";
+
+  out << "\nThe database stays in " << file.string() << "; look at it with for example\n"
+      << "   quarvo --db " << file.string() << " dump AFLBUD\n"
+      << "   quarvo --db " << file.string() << " check\n";
   return 0;
 }
 

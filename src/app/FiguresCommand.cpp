@@ -68,7 +68,9 @@ void recompute(Session& s, const std::string& line) {
 
 const char* kFigureNames[] = {"VENG", "VREA[0]", "VREA[1]", "VREA[2]"};
 
-Monnaie figure(const Figures& f, size_t i) { return i == 0 ? f.veng : f.vrea[i - 1]; }
+Monnaie figure(const Figures& f, size_t i) {
+  return i == 0 ? f.veng : f.vrea[i - 1];
+}
 
 std::vector<std::string> lines(const std::optional<std::string>& only) {
   if (only) return {*only};
@@ -139,7 +141,8 @@ int runCancel(Session& s, const std::string& kind, const std::string& ident, std
   while (links.lire(1) == 0) {
     std::string line = links.valeur("AFLBUD_IDENT").toChaine();
     Table exists(nullptr, "VOVOVA", "AFLBUD", "EXISTE");
-    Figures f = exists.chercher(3, "IDENT", '=', Valeur::chaine(line)) == 0 ? read(line) : Figures{};
+    Figures f =
+        exists.chercher(3, "IDENT", '=', Valeur::chaine(line)) == 0 ? read(line) : Figures{};
     touched.emplace_back(line, f);
   }
   out << "Cancellation of " << piece.table << " " << piece.ident << " (" << piece.numero << ")\n";
@@ -160,8 +163,8 @@ int runCancel(Session& s, const std::string& kind, const std::string& ident, std
       continue;
     }
     Figures after = read(line);
-    rows.push_back({line, before.veng.text(), after.veng.text(), before.vrea[0].text(),
-                    after.vrea[0].text()});
+    rows.push_back(
+        {line, before.veng.text(), after.veng.text(), before.vrea[0].text(), after.vrea[0].text()});
   }
   printTable(out, {"Budget line", "Committed before", "after", "Realised before", "after"}, rows);
   out << touched.size() << " link(s) removed.\n";

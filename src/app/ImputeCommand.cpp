@@ -16,7 +16,8 @@ namespace {
 std::string dateOption(const std::optional<std::string>& text, const char* name) {
   if (!text) return "";
   auto d = Date::parse(*text);
-  if (!d) throw UsageError(std::string("--") + name + " '" + *text + "' is not a date (dd/mm/yyyy)");
+  if (!d)
+    throw UsageError(std::string("--") + name + " '" + *text + "' is not a date (dd/mm/yyyy)");
   return d->text();
 }
 
@@ -27,8 +28,9 @@ std::string finDuMoisCourant(Session& s) {
     throw UsageError("company " + s.societe() + " does not exist");
   }
   std::string period = company.valeur("MOIS_ANNEE").toChaine();
-  auto first = period.size() == 6 ? Date::parse("01/" + period.substr(0, 2) + "/" + period.substr(2))
-                                  : std::nullopt;
+  auto first = period.size() == 6
+                   ? Date::parse("01/" + period.substr(0, 2) + "/" + period.substr(2))
+                   : std::nullopt;
   return first ? first->lastOfMonth().text() : "";
 }
 
@@ -57,8 +59,9 @@ void printProposal(std::ostream& out) {
     lines.chercher(3, "NUMERO", '/', Valeur::chaine(pieces.valeur("IDENT").toChaine() + "|"));
     lines.ouvrir();
     while (lines.lire(1) == 0) {
-      out << "  line " << lines.valeur("NUMERO").toChaine() << "  " << lines.valeur("GCPARTIC_CODE").toChaine()
-          << "  qty " << lines.valeur("QTE").toChaine() << "  HT " << lines.valeur("HT").toChaine()
+      out << "  line " << lines.valeur("NUMERO").toChaine() << "  "
+          << lines.valeur("GCPARTIC_CODE").toChaine() << "  qty " << lines.valeur("QTE").toChaine()
+          << "  HT " << lines.valeur("HT").toChaine()
           << (toEntier(lines.valeur("ERREUR")) != 0 ? "  in error" : "") << "\n";
       allocations.chercher(3, "IDENT", '=',
                            Valeur::chaine(lines.valeur("COMPOSANT").toChaine() + "|" +
@@ -67,7 +70,8 @@ void printProposal(std::ostream& out) {
       bool any = false;
       while (allocations.lire(1) == 0) {
         out << "    -> budget line " << allocations.valeur("AFLBUD_IDENT").toChaine() << "  qty "
-            << allocations.valeur("QTE").toChaine() << "  HT " << allocations.valeur("HT").toChaine() << "\n";
+            << allocations.valeur("QTE").toChaine() << "  HT "
+            << allocations.valeur("HT").toChaine() << "\n";
         any = true;
       }
       if (!any) out << "    -> no budget line found\n";
@@ -99,20 +103,27 @@ int runImpute(Session& s, const ImputeOptions& o, std::ostream& out) {
       max = o.numbers->substr(colon + 1);
     }
     for (const char* work : {"M_EAPPR", "M_LAPPR", "M_VAPPR"}) s.memoire(work).clear();
-    EvtParamVal selection{val(dateOption(o.from, "from")), val(o.to ? dateOption(o.to, "to") : finDuMoisCourant(s)), val(kind),
-                          val(o.arbitration ? 1 : 0), val(min), val(max), val(o.project.value_or(""))};
+    EvtParamVal selection{val(dateOption(o.from, "from")),
+                          val(o.to ? dateOption(o.to, "to") : finDuMoisCourant(s)),
+                          val(kind),
+                          val(o.arbitration ? 1 : 0),
+                          val(min),
+                          val(max),
+                          val(o.project.value_or(""))};
     s.appelerModule("QUARVO-POINTER_PIECES", &selection);
-    if (o.dryRun) printProposal(out);
-    else s.appelerModule("QUARVO-IMPUTER_PIECES", nullptr);
+    if (o.dryRun)
+      printProposal(out);
+    else
+      s.appelerModule("QUARVO-IMPUTER_PIECES", nullptr);
   }
   Table pieces(nullptr, "VOVOVA", "M_EAPPR", "RESUME");
   int64_t pointed = pieces.compter();
   pieces.ajouterCritere("IMPUTATION", '=', Valeur::chaine("O"));
   int64_t imputable = pieces.compter();
   int64_t linksAfter = linkRows();
-  out << "Pieces pointed: " << pointed << "; " << (o.dryRun ? "imputable: " : "imputed: ") << imputable
-      << "; in error: " << pointed - imputable << "; link rows written: "
-      << (o.dryRun ? 0 : linksAfter - linksBefore) << " new";
+  out << "Pieces pointed: " << pointed << "; " << (o.dryRun ? "imputable: " : "imputed: ")
+      << imputable << "; in error: " << pointed - imputable
+      << "; link rows written: " << (o.dryRun ? 0 : linksAfter - linksBefore) << " new";
   if (!o.dryRun) out << " (linked amount " << (linkTotal() - totalBefore).text() << ")";
   out << "\n";
   return 0;

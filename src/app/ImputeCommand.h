@@ -15,7 +15,7 @@
 namespace quarvo::app {
 
 struct ImputeOptions {
-  std::optional<std::string> from;     // dd/mm/yyyy or yyyy-mm-dd
+  std::optional<std::string> from;  // dd/mm/yyyy or yyyy-mm-dd
   std::optional<std::string> to;
   std::optional<std::string> kind;     // T, C, B or F
   std::optional<std::string> numbers;  // MIN:MAX, either side may be empty

@@ -53,7 +53,8 @@ void Afmouv::genererPiece(Evt* evt) {
   moves.ecrire("IDENT", ident.value());
   moves.ecrire("COMPOSANT", evt->valeur(0));
   moves.ecrire("COMPOSANT_IDENT", evt->valeur(1));
-  moves.ecrire("CLE_COMPO", Valeur::chaine(evt->valeur(0).toChaine() + "|" + evt->valeur(1).toChaine()));
+  moves.ecrire("CLE_COMPO",
+               Valeur::chaine(evt->valeur(0).toChaine() + "|" + evt->valeur(1).toChaine()));
   moves.ecrire("ETAT", Valeur::chaine("G"));
   moves.ecrire("DATE_MAJ", Valeur::date(Date::today()));
   erreurMethode(moves.inserer(), evt);

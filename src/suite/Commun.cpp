@@ -1,7 +1,9 @@
 #include "suite/Commun.h"
 
 #include "host/session/Session.h"
+#include "host/table/Champ.h"
 #include "suite/Catalogue.h"
+#include "suite/ImportTexte.h"
 
 namespace quarvo::suite {
 
@@ -12,6 +14,59 @@ std::vector<std::string> argsFrom(const Evt* evt, int first) {
   std::vector<std::string> args;
   for (int i = first; i < evt->nbParams(); ++i) args.push_back(evt->valeur(i).toChaine());
   return args;
+}
+
+// "BORNE_DATE" (preset code, first day by reference, last day by reference): see Commun.h.
+void borneDate(Automate& a, Evt* evt) {
+  Field debut("P_DEBUT", "", "", 4, Kind::Date, Valeur::date(Date()), &a);
+  Field fin("P_FIN", "", "", 4, Kind::Date, Valeur::date(Date()), &a);
+  evt->param(1, debut, 1);
+  evt->param(2, fin, 1);
+  std::string code = evt->valeur(0).toChaine();
+  Table societe(&a, "VOVOVA", "AFSOCI", "BORNE_DATE");
+  if (societe.chercher(3, "CODE", '=', Valeur::chaine(a.session().societe())) != 0) {
+    a.erreurMethode(1, evt);
+    return;
+  }
+  std::string mois = societe.valeur("MOIS_ANNEE").toChaine();
+  auto courant = mois.size() == 6 ? Date::parse("01/" + mois.substr(0, 2) + "/" + mois.substr(2, 4))
+                                  : std::nullopt;
+  if (!courant || courant->empty()) {
+    a.erreurMethode(1, evt);
+    return;
+  }
+  Date d = *courant;
+  Date from;
+  Date to;
+  if (code == "M") {
+    from = d;
+    to = d.lastOfMonth();
+  } else if (code == "MP") {
+    from = d.addMonths(-1);
+    to = from.lastOfMonth();
+  } else if (code == "T") {
+    from = Date::of(d.year(), (d.month() - 1) / 3 * 3 + 1, 1);
+    to = from.addMonths(2).lastOfMonth();
+  } else if (code == "A") {
+    from = Date::of(d.year(), 1, 1);
+    to = Date::of(d.year(), 12, 31);
+  } else if (code == "E") {
+    auto starts = splitList(societe.valeur("DATE_DEBUT").toChaine());
+    auto ends = splitList(societe.valeur("DATE_FIN").toChaine());
+    auto s = starts.empty() ? std::nullopt : Date::parse(starts[0]);
+    auto e = ends.empty() ? std::nullopt : Date::parse(ends[0]);
+    if (s && e) {
+      from = *s;
+      to = *e;
+    }
+  }
+  if (from.empty() || to.empty()) {
+    a.erreurMethode(1, evt);
+    return;
+  }
+  debut.set(from);
+  fin.set(to);
+  a.erreurMethode(0, evt);
 }
 
 // Writes `answer` into reference parameter `index` of the event, when there is one.
@@ -36,7 +91,11 @@ Commun::Commun(Evt* evt) : Interface2(evt) {
   addBranch("BOITE_AFFICHER_JAUGE", [this](Evt* e) {
     session().ui().attenteJauge(toEntier(e->valeur(0)), toEntier(e->valeur(1)));
   });
+  addBranch("BORNE_DATE", [this](Evt* e) { borneDate(*this, e); });
   addBranch("BOITE_SORTIR", [this](Evt*) { session().ui().attenteFin(); });
+  addBranch("IMPORT_CHARGER_TXT", [this](Evt* e) { ImportTexte::chargerTxt(*this, e); });
+  addBranch("IMPORT_CONSULTER_ERREURS", [this](Evt* e) { ImportTexte::consulterErreurs(*this, e); });
+  addBranch("IMPORT_SAUVER_ERREURS", [this](Evt* e) { ImportTexte::sauverErreurs(*this, e); });
 }
 
 std::string Commun::texteMessage(Session& s, const std::string& number,

@@ -13,6 +13,13 @@
 //   its first letter in capitals, followed by " :".
 // - "BOITE_AFFICHER_TITRE" (title), "BOITE_AFFICHER_LIBELLE" (text), "BOITE_AFFICHER_JAUGE"
 //   (done, total), "BOITE_SORTIR": the waiting box, shown by the session's driver.
+// - "IMPORT_CHARGER_TXT", "IMPORT_CONSULTER_ERREURS", "IMPORT_SAUVER_ERREURS": the text-file
+//   loader and the import error list; their rule is in ImportTexte.h.
+// - "BORNE_DATE" (preset code, first day by reference, last day by reference): the bounds of a
+//   period relative to the company's current month "MOIS_ANNEE" of "AFSOCI": "M" that month,
+//   "MP" the month before, "T" its quarter, "A" its calendar year, "E" the current fiscal year
+//   (first "DATE_DEBUT"/"DATE_FIN" pair). Fails, leaving both dates, for another code or when
+//   the company or its current month cannot be read.
 // A message number missing from the catalogue is shown as "Message <n>" so nothing is silent.
 #pragma once
 

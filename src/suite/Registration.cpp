@@ -13,6 +13,9 @@
 #include "suite/Gcpcompt.h"
 #include "suite/Gcptva.h"
 #include "suite/Parametres.h"
+#include "suite/PieceGeneration.h"
+#include "suite/PurchasingServices.h"
+#include "suite/Settling.h"
 #include "suite/Sysascii.h"
 #include "suite/Sysdroit.h"
 #include "suite/TableInterface.h"
@@ -75,18 +78,18 @@ const Module afcri3("", "AFCRI3-INTERFACE", &fabriquer<TableInterface>, false, "
 const Module afcri4("", "AFCRI4-INTERFACE", &fabriquer<TableInterface>, false, "");
 const Module afcri5("", "AFCRI5-INTERFACE", &fabriquer<TableInterface>, false, "");
 // Purchasing: suppliers and settling, depots, item-supplier links, due dates, piece modules.
-const Module gcpfour("", "GCPFOUR-INTERFACE", &fabriquer<TableInterface>, false, "");
-const Module gcpstock("", "GCPSTOCK-INTERFACE", &fabriquer<TableInterface>, false, "");
-const Module gcpx("", "GCPX-INTERFACE", &fabriquer<TableInterface>, false, "");
-const Module gaplot("", "GAPLOT-INTERFACE", &fabriquer<TableInterface>, false, "");
-const Module gcpste("", "GCPSTE-INTERFACE", &fabriquer<TableInterface>, false, "");
-const Module gcpdepot("", "GCPDEPOT-INTERFACE", &fabriquer<TableInterface>, false, "");
-const Module gapartfo("", "GAPARTFO-INTERFACE", &fabriquer<TableInterface>, false, "");
-const Module gapech("", "GAPECH-INTERFACE", &fabriquer<TableInterface>, false, "");
-const Module gapedev("", "GAPEDEV-INTERFACE", &fabriquer<TableInterface>, false, "");
-const Module gapecom("", "GAPECOM-INTERFACE", &fabriquer<TableInterface>, false, "");
-const Module gapebl("", "GAPEBL-INTERFACE", &fabriquer<TableInterface>, false, "");
-const Module gapefac("", "GAPEFAC-INTERFACE", &fabriquer<TableInterface>, false, "");
+const Module gcpfour("", "GCPFOUR-INTERFACE", &fabriquer<Gcpfour>, false, "");
+const Module gcpstock("", "GCPSTOCK-INTERFACE", &fabriquer<Gcpstock>, false, "");
+const Module gcpx("", "GCPX-INTERFACE", &fabriquer<Gcpx>, false, "");
+const Module gaplot("", "GAPLOT-INTERFACE", &fabriquer<Gaplot>, false, "");
+const Module gcpste("", "GCPSTE-INTERFACE", &fabriquer<Gcpste>, false, "");
+const Module gcpdepot("", "GCPDEPOT-INTERFACE", &fabriquer<Gcpdepot>, false, "");
+const Module gapartfo("", "GAPARTFO-INTERFACE", &fabriquer<Gapartfo>, false, "");
+const Module gapech("", "GAPECH-INTERFACE", &fabriquer<Gapech>, false, "");
+const Module gapedev("", "GAPEDEV-INTERFACE", &fabriquer<PieceGeneration>, false, "");
+const Module gapecom("", "GAPECOM-INTERFACE", &fabriquer<PieceGeneration>, false, "");
+const Module gapebl("", "GAPEBL-INTERFACE", &fabriquer<PieceGeneration>, false, "");
+const Module gapefac("", "GAPEFAC-INTERFACE", &fabriquer<PieceGeneration>, false, "");
 const host::Source source("SUITE", nullptr);
 
 }  // namespace

@@ -60,9 +60,10 @@ void TerminalDriver::attenteTitre(const std::string& title) {
   if (!bar_) out_ << title << "\n";
 }
 
+// Without a terminal the text of each step is not printed: a batch over thousands of pieces
+// would bury its messages under one line per piece; the gauge says how far it is.
 void TerminalDriver::attenteLibelle(const std::string& text) {
-  if (!bar_) out_ << "  " << text << "\n";
-  else title_ = text;
+  if (bar_) title_ = text;
 }
 
 void TerminalDriver::attenteJauge(int64_t done, int64_t total) {

@@ -1,7 +1,7 @@
 // The command line's driver: messages are printed on stderr with their title; questions take
 // the next answer given on the command line (--answer), else the refusal (last button); the
-// waiting box is a progress bar on stderr (redrawn in place on a terminal, a few lines
-// otherwise).
+// waiting box is a progress bar on stderr (redrawn in place on a terminal; otherwise its title
+// and a line at each quarter).
 #pragma once
 
 #include <chrono>

@@ -6,6 +6,11 @@
 #include "host/automate/Registry.h"
 #include "quarvo/analysis/QUARVOAnalyser.h"
 #include "quarvo/analysis/QUARVOAnnuler1.h"
+#include "quarvo/import/QUARVOImport_controler.h"
+#include "quarvo/import/QUARVOImport_generer.h"
+#include "quarvo/import/QUARVOImporter.h"
+#include "quarvo/import/QUARVOImporter_auto.h"
+#include "quarvo/import/QUARVOSolder.h"
 #include "quarvo/imputation/QUARVOImputer_auto.h"
 #include "quarvo/imputation/QUARVOImputer_pieces.h"
 #include "quarvo/imputation/QUARVOPointer_pieces.h"
@@ -45,6 +50,26 @@ const Source sourceD("QUARVO", nullptr);
 
 // Unit E: import and settling.
 const Global globalE("COMMUN", "QUARVO");
+const Module importer("", "QUARVO-IMPORTER", &fabriquer<QUARVOImporter>, false, "");
+const Module importerAuto("", "QUARVO-IMPORTER_AUTO", &fabriquer<QUARVOImporter_auto>, false,
+                          "");
+const Module importControlerBf("", "QUARVO-IMPORT_CONTROLER_BF",
+                                &fabriquer<QUARVOImport_controler_bf>, false, "");
+const Module importControlerCf("", "QUARVO-IMPORT_CONTROLER_CF",
+                                &fabriquer<QUARVOImport_controler_cf>, false, "");
+const Module importControlerDf("", "QUARVO-IMPORT_CONTROLER_DF",
+                                &fabriquer<QUARVOImport_controler_df>, false, "");
+const Module importControlerFf("", "QUARVO-IMPORT_CONTROLER_FF",
+                                &fabriquer<QUARVOImport_controler_ff>, false, "");
+const Module importGenererBf("", "QUARVO-IMPORT_GENERER_BF",
+                              &fabriquer<QUARVOImport_generer_bf>, false, "");
+const Module importGenererCf("", "QUARVO-IMPORT_GENERER_CF",
+                              &fabriquer<QUARVOImport_generer_cf>, false, "");
+const Module importGenererDf("", "QUARVO-IMPORT_GENERER_DF",
+                              &fabriquer<QUARVOImport_generer_df>, false, "");
+const Module importGenererFf("", "QUARVO-IMPORT_GENERER_FF",
+                              &fabriquer<QUARVOImport_generer_ff>, false, "");
+const Module solder("", "QUARVO-SOLDER", &fabriquer<QUARVOSolder>, false, "");
 const Source sourceE("QUARVO", nullptr);
 
 // Unit F: imputation and pointing.

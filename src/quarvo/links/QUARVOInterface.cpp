@@ -75,7 +75,8 @@ bool QUARVOInterface::verifierDossier(Evt* evt) {
 }
 
 bool QUARVOInterface::lireDroits() {
-  if (appeler(*this, "SYSDROIT", "LECTURE_DROITS_COURANTS", {ref(application_), val("I_SYSDROIT")}) == 0) {
+  if (appeler(*this, "SYSDROIT", "LECTURE_DROITS_COURANTS",
+              {ref(application_), val("I_SYSDROIT")}) == 0) {
     return true;
   }
   messageOk(*this, vChoix_, "36");
@@ -86,8 +87,8 @@ bool QUARVOInterface::droit(const std::string& letter, const std::string& refusa
                             const std::string& function) {
   if (!lireDroits()) return false;
   if (sysdroit_.valeur("DROITS").toChaine().find(letter) != std::string::npos) return true;
-  messageOk(*this, vChoix_, refusal, function.empty() ? std::vector<std::string>{}
-                                                       : std::vector<std::string>{function});
+  messageOk(*this, vChoix_, refusal,
+            function.empty() ? std::vector<std::string>{} : std::vector<std::string>{function});
   return false;
 }
 
@@ -110,7 +111,8 @@ void QUARVOInterface::gestion(Evt* evt) {
     erreurMethode(1, evt);
     return;
   }
-  appeler(*this, "SYSDROIT", "COMPARE_DROIT", {ref(mode), sysdroit_.valeur("DROITS"), val("GESTION")});
+  appeler(*this, "SYSDROIT", "COMPARE_DROIT",
+          {ref(mode), sysdroit_.valeur("DROITS"), val("GESTION")});
   if (mode.text().empty()) {
     messageOk(*this, vChoix_, "37", {"GESTION"});
     erreurMethode(1, evt);
@@ -127,9 +129,15 @@ void QUARVOInterface::analyser(Evt* evt) {
   erreurMethode(erreurMethode(), evt);
 }
 
-void QUARVOInterface::annuler(Evt* evt) { ouvrir(evt, "A", "QUARVO-ANNULER"); }
-void QUARVOInterface::imputer(Evt* evt) { ouvrir(evt, "C", "QUARVO-IMPUTER"); }
-void QUARVOInterface::seletat1(Evt* evt) { ouvrir(evt, "I", "QUARVO-SELETAT1"); }
+void QUARVOInterface::annuler(Evt* evt) {
+  ouvrir(evt, "A", "QUARVO-ANNULER");
+}
+void QUARVOInterface::imputer(Evt* evt) {
+  ouvrir(evt, "C", "QUARVO-IMPUTER");
+}
+void QUARVOInterface::seletat1(Evt* evt) {
+  ouvrir(evt, "I", "QUARVO-SELETAT1");
+}
 
 void QUARVOInterface::importer(Evt* evt) {
   if (!verifierDossier(evt)) return;
@@ -158,8 +166,12 @@ void QUARVOInterface::verif_droits(Evt* evt) {
   erreurMethode(droit(letter, "38", "") ? 0 : 1, evt);
 }
 
-void QUARVOInterface::validation_maj(Evt* evt) { mettreAJour(evt, +1); }
-void QUARVOInterface::suppression_maj(Evt* evt) { mettreAJour(evt, -1); }
+void QUARVOInterface::validation_maj(Evt* evt) {
+  mettreAJour(evt, +1);
+}
+void QUARVOInterface::suppression_maj(Evt* evt) {
+  mettreAJour(evt, -1);
+}
 
 void QUARVOInterface::mettreAJour(Evt* evt, int sign) {
   const bool validation = sign > 0;
@@ -216,7 +228,8 @@ void QUARVOInterface::mettreAJour(Evt* evt, int sign) {
     }
     if (kind == "GAPEBL") {
       if (!receipts) continue;
-      Monnaie part = partNonFacturee(ht, toDouble(quarvo_.valeur("QTE")), toDouble(quarvo_.valeur("QTT")));
+      Monnaie part =
+          partNonFacturee(ht, toDouble(quarvo_.valeur("QTE")), toDouble(quarvo_.valeur("QTT")));
       totReceptions += part;
       // A receipt fully invoiced has nothing left to book: no movement of its own.
       if (part.isZero()) continue;
@@ -245,7 +258,8 @@ void QUARVOInterface::mettreAJour(Evt* evt, int sign) {
   Champ vraf("VRAF", aflbud_);
   Monnaie realise = totReceptions + totFactures;
   veng.set(validation ? veng.monnaie() + totCommandes : veng.monnaie() - totCommandes);
-  for (size_t i = 0; i < 3; ++i) vrea.setAt(i, validation ? vrea.at(i) + realise : vrea.at(i) - realise);
+  for (size_t i = 0; i < 3; ++i)
+    vrea.setAt(i, validation ? vrea.at(i) + realise : vrea.at(i) - realise);
 
   double hbud = toDouble(aflbud_.valeur("HBUD"));
   double hrea = toDouble(aflbud_.valeur("HREA"));

@@ -1,0 +1,142 @@
+#include "app/ImportCommand.h"
+
+#include <CLI/CLI.hpp>
+#include <algorithm>
+#include <array>
+#include <filesystem>
+
+#include "app/Workspace.h"
+#include "host/automate/Automate.h"
+#include "host/table/Table.h"
+#include "host/ui/Ecran.h"
+#include "quarvo/import/QUARVOImporter_auto.h"
+
+namespace quarvo::app {
+
+using namespace host;
+namespace fs = std::filesystem;
+
+CLI::App* addImportCommand(CLI::App& cli, ImportOptions& o) {
+  auto* import = cli.add_subcommand(
+      "import", "Import purchase pieces from tab-separated text files (format EXCEL1)");
+  import->add_option("--df", o.df, "File of supplier quote requests");
+  import->add_option("--cf", o.cf, "File of supplier orders");
+  import->add_option("--bf", o.bf, "File of goods-received notes");
+  import->add_option("--ff", o.ff, "File of supplier invoices and credit notes");
+  import->add_flag("--check-only", o.checkOnly, "Control the files without importing them");
+  auto* automatic = import->add_flag(
+      "--auto", o.automatique,
+      "Import the default files of the import settings (AFPARA IMPORT_03..06) unattended");
+  for (const char* name : {"--df", "--cf", "--bf", "--ff", "--check-only"}) {
+    automatic->excludes(name);
+  }
+  return import;
+}
+
+namespace {
+
+std::string dernierNumeroErreur() {
+  Table err(nullptr, "VOVOVA", "IMM_ERREUR", "COMMANDE");
+  err.effacerCriteres();
+  return err.lire(4) == 0 ? err.valeur("IDENT").toChaine() : std::string();
+}
+
+// The error rows numbered after `after`, as an aligned table; returns how many.
+size_t imprimerErreurs(const std::string& after, std::ostream& out) {
+  Table err(nullptr, "VOVOVA", "IMM_ERREUR", "COMMANDE");
+  err.effacerCriteres();
+  if (!after.empty()) err.ajouterCritere("IDENT", '+', Valeur::chaine(after + "\x01"));
+  err.ouvrir();
+  const std::array<const char*, 5> columns{"IDENT", "COMPOSANT", "CODE", "DESIG", "CMT"};
+  std::vector<std::array<std::string, 5>> rows;
+  std::array<size_t, 5> widths{};
+  for (size_t i = 0; i < columns.size(); ++i) widths[i] = std::string(columns[i]).size();
+  auto length = [](const std::string& s) {
+    size_t n = 0;
+    for (unsigned char c : s) n += (c & 0xC0) != 0x80 ? 1 : 0;
+    return n;
+  };
+  while (err.lire(1) == 0) {
+    std::array<std::string, 5> row;
+    for (size_t i = 0; i < columns.size(); ++i) {
+      row[i] = err.valeur(columns[i]).toChaine();
+      if (i + 1 < columns.size()) widths[i] = std::max(widths[i], length(row[i]));
+    }
+    rows.push_back(std::move(row));
+  }
+  if (rows.empty()) return 0;
+  auto print = [&](const std::array<std::string, 5>& cells) {
+    for (size_t i = 0; i < cells.size(); ++i) {
+      out << cells[i];
+      if (i + 1 < cells.size()) out << std::string(widths[i] - length(cells[i]) + 2, ' ');
+    }
+    out << "\n";
+  };
+  print({columns[0], columns[1], columns[2], columns[3], columns[4]});
+  for (const auto& r : rows) print(r);
+  return rows.size();
+}
+
+int importAuto(Session& session, std::ostream& out) {
+  fs::path report = QUARVOImporter_auto::cheminRapport(session.societe(), Date::today());
+  std::error_code ec;
+  auto sizeBefore = fs::exists(report, ec) ? fs::file_size(report, ec) : 0;
+  EvtParamVal none;
+  int outcome = session.appelerModule("QUARVO-IMPORTER_AUTO", &none);
+  session.executerEnAttente();
+  auto sizeAfter = fs::exists(report, ec) ? fs::file_size(report, ec) : 0;
+  if (outcome != 0) {
+    out << "errors were found but the report " << report.string()
+        << " could not be written: they stay in the error table\n";
+    return 1;
+  }
+  if (sizeAfter != sizeBefore) {
+    out << "errors were found: report written to " << report.string() << "\n";
+    return 1;
+  }
+  out << "import done without error (no report written)\n";
+  return 0;
+}
+
+}  // namespace
+
+int runImport(Session& session, const ImportOptions& o, std::ostream& out) {
+  if (o.automatique) return importAuto(session, out);
+  const std::array<std::pair<const char*, std::string>, 4> files{
+      {{"V_FICHIER_DF", o.df}, {"V_FICHIER_CF", o.cf}, {"V_FICHIER_BF", o.bf},
+       {"V_FICHIER_FF", o.ff}}};
+  if (std::all_of(files.begin(), files.end(), [](const auto& f) { return f.second.empty(); })) {
+    throw UsageError("name at least one file (--df, --cf, --bf, --ff) or use --auto");
+  }
+  std::string before = dernierNumeroErreur();
+  EvtParamVal none;
+  session.appelerModule("QUARVO-IMPORTER", &none);
+  Automate* window = session.fenetre("QUARVO-IMPORTER");
+  if (window == nullptr) throw UsageError("the import window could not be opened");
+  for (const auto& [field, path] : files) {
+    if (!path.empty() && !window->ecran().controle(field).actif) {
+      out << "the import of " << std::string(field).substr(10)
+          << " files is switched off in the settings (AFPARA): " << path << " is not imported\n";
+    }
+    window->champ(field)->set(path);
+  }
+  window->champ("V_MODE")->set(int64_t{o.checkOnly ? 0 : 1});
+  window->raise("VALIDATION", &none);
+  session.executerEnAttente();
+  if (!window->termine()) {
+    out << "the files were refused: nothing was imported\n";
+    window->sortir();
+    return 1;
+  }
+  int64_t errors = 0;
+  for (const char* field : {"V_ERREUR_DF", "V_ERREUR_CF", "V_ERREUR_BF", "V_ERREUR_FF"}) {
+    errors += window->champ(field)->entier();
+  }
+  size_t printed = imprimerErreurs(before, out);
+  if (errors == 0 && printed == 0) {
+    out << (o.checkOnly ? "control done without error\n" : "import done without error\n");
+  }
+  return errors == 0 && printed == 0 ? 0 : 1;
+}
+
+}  // namespace quarvo::app

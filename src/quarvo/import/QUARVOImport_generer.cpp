@@ -1,0 +1,551 @@
+#include "quarvo/import/QUARVOImport_generer.h"
+
+#include <algorithm>
+#include <cstdlib>
+
+#include "host/session/Session.h"
+#include "quarvo/frame/Keys.h"
+#include "quarvo/import/ImportOutils.h"
+
+namespace quarvo {
+
+using namespace host;
+using Montants = DifferencesGeneration::Montants;
+using Solde = DifferencesGeneration::Solde;
+
+namespace {
+
+// Fault injection for the crash tests: with QUARVO_FAIL_AFTER_PIECES=N the process dies in the
+// middle of the piece that follows the N-th piece written, before that piece commits. The count
+// starts again whenever the variable changes (a test's child process sets it after forking).
+int64_t piecesEcrites = 0;
+
+int64_t limitePieces() {
+  static std::string vu;
+  const char* text = std::getenv("QUARVO_FAIL_AFTER_PIECES");
+  std::string valeur = text != nullptr ? text : "";
+  if (valeur != vu) {
+    vu = valeur;
+    piecesEcrites = 0;
+  }
+  return valeur.empty() ? int64_t{-1} : import::enNombre(valeur);
+}
+
+}  // namespace
+
+QUARVOImport_generer::QUARVOImport_generer(Evt* evt, const DifferencesGeneration& kind)
+    : Parcours(evt),
+      kind_(kind),
+      pErreur_(entier("P_ERREUR")),
+      vMo_(chaine("V_MO")),
+      vAn_(chaine("V_AN")),
+      vAnmo_(chaine("V_ANMO")),
+      vCodePartage_(chaine("V_CODE_PARTAGE")),
+      vDepotIdent_(chaine("V_DEPOT_IDENT")),
+      vCreerPiece_(chaine("V_CREER_PIECE")),
+      vPieceIdent_(chaine("V_PIECE_IDENT")),
+      vAvoir_(entier("V_AVOIR")),
+      vCreerAflbud_(entier("V_CREER_AFLBUD")),
+      vQte_(dbl("V_QTE")),
+      vHt_(monnaie("V_HT")),
+      vChoix_(chaine("V_CHOIX")),
+      vCritereAchat_(chaine("V_CRITERE_ACHAT")),
+      vPrestationIdent_(chaine("V_PRESTATION_IDENT")),
+      pAffa_(chaine("PAFFA")),
+      pPost_(chaine("PPOST")),
+      pAnmo_(chaine("PANMO")),
+      vJauge1_(dbl("V_JAUGE1")),
+      vJauge2_(dbl("V_JAUGE2")),
+      vTexte_(chaine("VTEXTE")),
+      pieces_(this, "GESCOM", kind.entete, "PIECES"),
+      genere_(this, "", "M_GENERE", "M_GENERE2"),
+      gcptxtva_(this, "GESCOM", "GCPTXTVA", "GCPTXTVA2"),
+      afebud_(this, "VOVOVA", "AFEBUD", ""),
+      aflbud_(this, "VOVOVA", "AFLBUD", ""),
+      quarvo_(this, "VOVOVA", "QUARVO", ""),
+      iAfsoci_(this, "VOVOVA", "I_AFSOCI", ""),
+      iAfpara_(this, "VOVOVA", "I_AFPARA", ""),
+      iGcpste_(this, "GESCOM", "I_GCPSTE", ""),
+      iGcpfour_(this, "GESCOM", "I_GCPFOUR", ""),
+      iGcpartic_(this, "GESCOM", "I_GCPARTIC", ""),
+      iAfaffa_(this, "VOVOVA", "I_AFAFFA", ""),
+      iAfpres_(this, "VOVOVA", "I_AFPRES", "") {
+  lierParametres(evt, {{&pErreur_, 1}});
+  limite_ = limitePieces();
+  nomBase("VOVOVA");
+  nomTable(kind_.staging);
+  plan({"NUMERO_DOC"}, "NUMERO_DOC");
+  addBranch("DEBUT", [this](Evt* e) { debut(e); });
+  addBranch("DEBUT1", [this](Evt* e) { debut1(e); });
+  addBranch("POUR_TOUT", [this](Evt* e) { pour_tout(e); });
+  if (kind_.majLigne) addBranch("MAJ_LIGNE", [this](Evt* e) { maj_ligne(e); });
+  addBranch("FIN1", [this](Evt* e) { fin1(e); });
+  addBranch("SORTIE", [this](Evt* e) { sortie(e); });
+  addBranch("MESSAGE_ERREUR", [this](Evt* e) { message_erreur(e); });
+}
+
+QUARVOImport_generer::~QUARVOImport_generer() = default;
+
+void QUARVOImport_generer::executer(Evt* evt) {
+  Parcours::executer(evt);
+  if (!sortieFaite_) {
+    EvtParamVal none;
+    raise("SORTIE", evt != nullptr ? evt : &none);
+  }
+}
+
+Valeur QUARVOImport_generer::stagedValeur(const char* column) {
+  auto i = courant().store().schema().index(column);
+  if (!i || *i >= ligne_.values.size()) return Valeur();
+  return ligne_.values[*i];
+}
+
+std::string QUARVOImport_generer::staged(const char* column) {
+  return stagedValeur(column).toChaine();
+}
+
+bool QUARVOImport_generer::appeler(const char* module, const char* label, Evt& evt,
+                                   const char* instance) {
+  appelerProcedure(instance, module, "INTERFACE", label, &evt, -1);
+  return erreurMethode() == 0;
+}
+
+bool QUARVOImport_generer::protocole(const char* label, Evt& evt) {
+  if (appeler(kind_.entete, label, evt)) return true;
+  EvtParamVal none;
+  appelerProcedure("", "", "", "MESSAGE_ERREUR", &none, 0);
+  return false;
+}
+
+void QUARVOImport_generer::jauge() {
+  vJauge1_.set(vJauge1_.dbl() + 1);
+  auto done = static_cast<int64_t>(vJauge1_.dbl());
+  auto total = static_cast<int64_t>(vJauge2_.dbl());
+  if (done % pasJauge_ != 0 && done != total) return;
+  EvtParamVal gauge{Arg(vJauge1_.value()), Arg(vJauge2_.value())};
+  appelerProcedure("*", "COMMUN", "INTERFACE", "BOITE_AFFICHER_JAUGE", &gauge, -1);
+}
+
+// ---------------------------------------------------------------------------------------------
+
+void QUARVOImport_generer::debut(Evt* evt) {
+  Automate::debut(evt);
+  Table compte(this, "VOVOVA", kind_.staging, "COMPTE");
+  compte.effacerCriteres();
+  int64_t total = compte.compter();
+  if (total == 0) {
+    sortir(nullptr, 0);
+    return;
+  }
+  if (kind_.moisSociete) {
+    EvtParamVal societe{val("SOCIETE")};
+    appeler("AFSOCI", "LECTURE_CODE", societe, "*1");
+    std::string moisAnnee = iAfsoci_.valeur("MOIS_ANNEE").toChaine();
+    vMo_.set(import::caracteres(moisAnnee, 1, 2));
+    vAn_.set(import::caracteres(moisAnnee, 3, 6));
+    vAnmo_.set(vAn_.text() + vMo_.text());
+  }
+  EvtParamVal machat{val("MACHAT")};
+  bool parametreLu = appeler("AFPARA", "LECTURE_CODE", machat, "*1");
+  vCritereAchat_.set("0");
+  if (parametreLu && toEntier(iAfpara_.valeur("PARAM3")) == 1) {
+    vCritereAchat_.assign(iAfpara_.valeur("PARAM1"));
+  }
+
+  EvtParamRef generation{ref(vCodePartage_), val("U")};
+  generationOuverte_ = protocole("DEBUT_GENERATION", generation);
+
+  if (genere_.chercher(3, "INST", '=', vCodePartage_.value()) != 0) {
+    EvtParamRef message{val("115"), ref(vChoix_), val(kind_.entete)};
+    appelerProcedure("*", "COMMUN", "INTERFACE", "MESS_OK", &message, -1);
+    pErreur_.set(int64_t{1});
+    sortir(nullptr, 0);
+    return;
+  }
+
+  EvtParamVal settings{val("")};
+  appeler("GCPSTE", "LECTURE", settings);
+  saisieAna_ = toEntier(iGcpste_.valeur("SAISIE_ANA_A"));
+  EvtParamRef depot{ref(vDepotIdent_)};
+  appeler("GCPSTE", "DEPOT", depot);
+  if (vDepotIdent_.text().empty()) {
+    EvtParamRef principal{ref(vDepotIdent_)};
+    appeler("GCPDEPOT", "DEPOT_PRINCIPAL", principal);
+  }
+
+  vJauge1_.set(0.0);
+  vJauge2_.set(static_cast<double>(total));
+  pasJauge_ = std::max<int64_t>(1, total / 100);
+  EvtParamVal titre{val(std::string("Traitement de la table ") + kind_.staging)};
+  appelerProcedure("*", "COMMUN", "INTERFACE", "BOITE_AFFICHER_TITRE", &titre, -1);
+  boiteOuverte_ = true;
+  EvtParamVal libelle{val("Etape 3 : import ...")};
+  appelerProcedure("*", "COMMUN", "INTERFACE", "BOITE_AFFICHER_LIBELLE", &libelle, -1);
+}
+
+void QUARVOImport_generer::abandonnerPiece() {
+  piece_.reset();  // rolls back everything written for the piece
+  vCreerPiece_.set("0");
+  vPieceIdent_.set("");
+}
+
+void QUARVOImport_generer::debut1(Evt*) {
+  ligne_ = courant().ligne();
+  piece_.reset();
+  vCreerPiece_.set("1");
+  vPieceIdent_.set("");
+  std::string numero = staged("NUMERO_DOC");
+  if (pieces_.chercher(3, "NUMERO_DOC", '=', Valeur::chaine(numero)) == 0) {
+    // Generated before (by an earlier run): kept as it is, only settled when asked.
+    vCreerPiece_.set("0");
+    vPieceIdent_.assign(pieces_.valeur("IDENT"));
+    return;
+  }
+  vAvoir_.set(int64_t{kind_.avoirs && staged("TYPE") == "A" ? 1 : 0});
+
+  EvtParamVal four{val(staged("FOURNISSEUR"))};
+  appeler("GCPFOUR", "LECTURE_CODE", four, "*1");
+  fournisseurIdent_ = iGcpfour_.valeur("IDENT").toChaine();
+  regime_ = iGcpfour_.valeur("GCPREGM_IDENT").toChaine();
+
+  piece_ = std::make_unique<Transaction>(session().db());
+  std::vector<Arg> args{ref(vPieceIdent_), val(fournisseurIdent_), Arg(stagedValeur("DATE_CREATION")),
+                        ref(vDepotIdent_), val("EUR")};
+  if (kind_.avoirs) {
+    args.push_back(val(-1));
+    args.push_back(val(saisieAna_ == 1 ? staged("AFFAIRE") : std::string()));
+    args.push_back(ref(vAvoir_));
+  } else if (saisieAna_ == 1) {
+    args.push_back(val(-1));
+    args.push_back(val(staged("AFFAIRE")));
+  }
+  EvtParamRef debutPiece(std::move(args));
+  if (!protocole("DEBUT_PIECE_GENEREE", debutPiece)) {
+    abandonnerPiece();
+    return;
+  }
+  if (pieces_.chercher(3, "IDENT", '=', vPieceIdent_.value()) == 0) {
+    dateMaj_ = pieces_.valeur("DATE_MAJ");
+    heureMaj_ = pieces_.valeur("HEURE_MAJ");
+  }
+}
+
+void QUARVOImport_generer::pour_tout(Evt*) {
+  ligne_ = courant().ligne();
+  if (vCreerPiece_.text() != "1") {
+    jauge();
+    return;
+  }
+  // An empty exchange record for the line.
+  if (genere_.chercher(3, "INST", '=', vCodePartage_.value()) != 0) {
+    abandonnerPiece();
+    jauge();
+    return;
+  }
+  const auto& colonnes = genere_.store().schema().columns();
+  for (const auto& c : colonnes) {
+    if (c.name != "INST") genere_.ecrire(c.name, Valeur::chaine(""));
+  }
+
+  // A comment line has no service: it is never booked on a budget.
+  vPrestationIdent_.set("");
+  std::string article = staged("ARTICLE");
+  if (!article.empty()) {
+    EvtParamVal art{val(article)};
+    appeler("GCPARTIC", "LECTURE_CODE", art, "*1");
+    EvtParamRef regroupement{Arg(vCritereAchat_.value()),
+                             Arg(iGcpartic_.valeur("IDENT")),
+                             Arg(iGcpartic_.valeur("GCPCRIT1_IDENT")),
+                             Arg(iGcpartic_.valeur("GCPCRIT2_IDENT")),
+                             Arg(iGcpartic_.valeur("GCPCRIT3_IDENT")),
+                             ref(vPrestationIdent_)};
+    appeler("AFPARA", "REGROUPEMENT_ACHAT", regroupement);
+    EvtParamVal lien{Arg(iGcpartic_.valeur("IDENT")), val(fournisseurIdent_), val(1)};
+    appeler("GAPARTFO", "LECTURE_ET_CREATION", lien);
+
+    genere_.ecrire("GCPARTIC_IDENT", iGcpartic_.valeur("IDENT"));
+    genere_.ecrire("GCPARTIC_CODE", iGcpartic_.valeur("CODE"));
+    std::string desig = staged("DESIG");
+    genere_.ecrire("DESIG", desig.empty() ? iGcpartic_.valeur("DESIG") : Valeur::chaine(desig));
+    genere_.ecrire("QTE", stagedValeur("QTE"));
+    genere_.ecrire("PUHT", stagedValeur("PUHT"));
+    genere_.ecrire("TAUX_REMISE", stagedValeur("TAUX_REMISE"));
+    genere_.ecrire("GCPDEPOT_IDENT", vDepotIdent_.value());
+    if (saisieAna_ == 2) genere_.ecrire("SECAN_CODE", stagedValeur("AFFAIRE"));
+    gcptxtva_.effacerCriteres();
+    gcptxtva_.ajouterCritere("GCPREGM_IDENT", '=', Valeur::chaine(regime_), 'A');
+    gcptxtva_.ouvrir();
+    Valeur taux = stagedValeur("TAUX_TVA");
+    while (gcptxtva_.lire(1, 'A') == 0) {
+      if (Valeur::compare(gcptxtva_.valeur("TAUX"), taux) == 0) {
+        genere_.ecrire("GCPTVA_IDENT", gcptxtva_.valeur("GCPTVA_IDENT"));
+        break;
+      }
+    }
+  } else {
+    genere_.ecrire("DESIG", stagedValeur("DESIG"));
+    genere_.ecrire("STYLE", Valeur::entier(2));
+  }
+
+  genere_.modifier();
+  EvtParamVal none;
+  if (!protocole("LIGNE_COPIEE", none)) {
+    abandonnerPiece();
+    jauge();
+    return;
+  }
+  if (kind_.majLigne) appelerProcedure("", "", "", "MAJ_LIGNE", &none, 0);
+  if (limite_ >= 0 && piecesEcrites >= limite_) std::_Exit(75);
+  jauge();
+}
+
+void QUARVOImport_generer::maj_ligne(Evt*) {
+  std::string budget = staged("BUDGET");
+  if (budget.empty()) return;
+  std::string affaire = staged("AFFAIRE");
+  EvtParamVal projet{val(affaire)};
+  if (!appeler("AFAFFA", "LECTURE_CODE", projet, "*1")) return;
+  // The service comes by its identifier (read by code it would never be found).
+  EvtParamVal service{Arg(vPrestationIdent_.value())};
+  if (vPrestationIdent_.text().empty() || !appeler("AFPRES", "LECTURE", service, "*1")) return;
+
+  vQte_.assign(stagedValeur("QTE"));
+  vHt_.set(valeurArrondie(toMonnaie(stagedValeur("PUHT")) * vQte_.dbl(), 2, '='));
+  if (vAvoir_.entier() == 1) {
+    vQte_.set(-vQte_.dbl());
+    vHt_.set(-vHt_.monnaie());
+  }
+
+  if (afebud_.chercher(3, "CLE_COMPO2", '=', Valeur::chaine(affaire + "|" + budget)) != 0) return;
+  std::string budgetIdent = afebud_.valeur("IDENT").toChaine();
+
+  aflbud_.effacerCriteres();
+  aflbud_.ajouterCritere("NUMERO", '/', Valeur::chaine(budgetIdent + "|"), 'R');
+  aflbud_.ouvrir();
+  vCreerAflbud_.set(int64_t{1});
+  while (aflbud_.lire(1, 'A') == 0) {
+    if (aflbud_.valeur("AFPRES_IDENT").toChaine() == vPrestationIdent_.text()) {
+      vCreerAflbud_.set(int64_t{0});
+      break;
+    }
+  }
+  if (vCreerAflbud_.entier() == 1) {
+    Field& ident = chaine("V_AFLBUD_IDENT");
+    EvtParamRef attribue{val("VOVOVA"), val("NUMEROS"), val("AFLBUD"), val(""), val(10), ref(ident)};
+    if (!appeler("ZUMNDOC", "ATTRIBUE_NUMERO", attribue)) return;
+    EvtParamRef valide{val("VOVOVA"), val("NUMEROS"), val("AFLBUD"), val(""), val(10), ref(ident)};
+    if (!appeler("ZUMNDOC", "VALIDE_NUMERO", valide)) return;
+    aflbud_.preparer();
+    aflbud_.ecrire("IDENT", ident.value());
+    aflbud_.ecrire("NUMERO", Valeur::chaine(budgetIdent + "|"));
+    aflbud_.ecrire("AFAFFA_IDENT", afebud_.valeur("AFAFFA_IDENT"));
+    aflbud_.ecrire("AFAFFA_CODE", afebud_.valeur("AFAFFA_CODE"));
+    aflbud_.ecrire("AFEBUD_PIECE", afebud_.valeur("PIECE"));
+    aflbud_.ecrire("AFPRES_IDENT", iAfpres_.valeur("IDENT"));
+    aflbud_.ecrire("AFPRES_CODE", iAfpres_.valeur("CODE"));
+    aflbud_.ecrire("DESIG", iAfpres_.valeur("DESIG"));
+    aflbud_.ecrire("UNITE", iAfpres_.valeur("UNITE"));
+    aflbud_.ecrire("DATE_DEBUT", afebud_.valeur("DATE_DEBUT"));
+    aflbud_.ecrire("DATE_FIN", afebud_.valeur("DATE_FIN"));
+    aflbud_.ecrire("APPRO", Valeur::chaine("A"));
+  }
+
+  Champ veng("VENG", aflbud_);
+  Champ vrea("VREA", aflbud_);
+  Champ vraf("VRAF", aflbud_);
+  if (kind_.montants == Montants::Engage) {
+    veng.set(veng.monnaie() + vHt_.monnaie());
+  } else if (kind_.montants == Montants::Realise) {
+    Monnaie realise = vrea.at(0) + vHt_.monnaie();
+    for (size_t i = 0; i < 3; ++i) vrea.setAt(i, realise);
+    Monnaie budgete = toMonnaie(aflbud_.valeur("VBUD_D"));
+    Monnaie reste = budgete - realise;
+    if (reste < Monnaie()) reste = Monnaie();
+    for (size_t i = 0; i < 3; ++i) vraf.setAt(i, reste);
+    double hbud = toDouble(aflbud_.valeur("HBUD"));
+    double avancement = 0;
+    if (hbud != 0) {
+      avancement = (hbud - toDouble(aflbud_.valeur("HRAF"))) / hbud * 100;
+    } else if (!budgete.isZero()) {
+      avancement = ((budgete - reste) / budgete).toDouble() * 100;
+    }
+    aflbud_.ecrire("AVT", Valeur::dbl(std::clamp(avancement, 0.0, 100.0)));
+  }
+  if (vCreerAflbud_.entier() == 1) {
+    aflbud_.inserer();
+  } else {
+    aflbud_.modifier();
+  }
+  std::string ligneIdent = aflbud_.valeur("IDENT").toChaine();
+
+  std::string cle = frame::cleCompo(ligneIdent, kind_.entete, staged("NUMERO_DOC"));
+  if (quarvo_.chercher(3, "CLE_COMPO", '=', Valeur::chaine(cle)) != 0) {
+    Field& ident = chaine("V_QUARVO_IDENT");
+    EvtParamRef attribue{val("VOVOVA"), val("NUMEROS"), val("QUARVO"), val(""), val(10), ref(ident)};
+    if (!appeler("ZUMNDOC", "ATTRIBUE_NUMERO", attribue)) return;
+    EvtParamRef valide{val("VOVOVA"), val("NUMEROS"), val("QUARVO"), val(""), val(10), ref(ident)};
+    if (!appeler("ZUMNDOC", "VALIDE_NUMERO", valide)) return;
+    quarvo_.preparer();
+    quarvo_.ecrire("IDENT", ident.value());
+    quarvo_.ecrire("AFEBUD_IDENT", Valeur::chaine(budgetIdent));
+    quarvo_.ecrire("AFAFFA_IDENT", iAfaffa_.valeur("IDENT"));
+    quarvo_.ecrire("AFAFFA_CODE", iAfaffa_.valeur("CODE"));
+    quarvo_.ecrire("AFLBUD_IDENT", Valeur::chaine(ligneIdent));
+    quarvo_.ecrire("COMPOSANT", Valeur::chaine(kind_.entete));
+    quarvo_.ecrire("COMPOSANT_IDENT", vPieceIdent_.value());
+    quarvo_.ecrire("PIECE", stagedValeur("NUMERO_DOC"));
+    quarvo_.ecrire("DATE_PIECE", stagedValeur("DATE_CREATION"));
+    quarvo_.ecrire("DATE_MAJ", dateMaj_);
+    quarvo_.ecrire("HEURE_MAJ", heureMaj_);
+    quarvo_.ecrire("CLE_COMPO", Valeur::chaine(cle));
+    quarvo_.ecrire("CLE_COMPO2", Valeur::chaine(frame::cleCompo2(kind_.entete, vPieceIdent_.text())));
+    quarvo_.inserer();
+  }
+  quarvo_.ecrire("QTE", Valeur::dbl(toDouble(quarvo_.valeur("QTE")) + vQte_.dbl()));
+  quarvo_.ecrire("HT", Valeur::monnaie(toMonnaie(quarvo_.valeur("HT")) + vHt_.monnaie()));
+  quarvo_.modifier();
+
+  if (kind_.resultats) {
+    std::string datePiece = quarvo_.valeur("DATE_PIECE").toChaine();
+    vAn_.set(import::caracteres(datePiece, 7, 10));
+    vMo_.set(import::caracteres(datePiece, 4, 5));
+    vAnmo_.set(vAn_.text() + vMo_.text());
+    Table resu(this, "", "M_RESU1", "");
+    resu.preparer();
+    resu.ecrire("AFAFFA_IDENT", iAfaffa_.valeur("IDENT"));
+    resu.ecrire("AFPOST_CODE", iAfpres_.valeur("POSTE_ACHAT"));
+    resu.ecrire("ANNEE_MOIS", vAnmo_.value());
+    resu.ecrire("TYPE", Valeur::chaine("D"));
+    resu.ecrire("VENG", Valeur::monnaie(-vHt_.monnaie()));
+    resu.inserer();
+    EvtParamVal none;
+    appeler("AFRESU", "MAJ_AFRESU", none);
+  }
+  if (kind_.calculRaf) {
+    pAffa_.assign(iAfaffa_.valeur("IDENT"));
+    pPost_.assign(iAfpres_.valeur("POSTE_ACHAT"));
+    pAnmo_.assign(vAnmo_.value());
+    EvtParamRef raf{ref(pAffa_), ref(pPost_), ref(pAnmo_)};
+    appeler("AFRESU", "CALCUL_RAF_D", raf);
+  }
+}
+
+// ---------------------------------------------------------------------------------------------
+
+std::string QUARVOImport_generer::demandeur(const std::string& code) {
+  if (code.empty()) return "";
+  EvtParamVal personne{val(code)};
+  if (!appeler("AFPERS", "LECTURE_CODE", personne, "*1")) return "";
+  Table iAfpers(this, "VOVOVA", "I_AFPERS", "");
+  Valeur nom = iAfpers.valeur("NOM");
+  Valeur prenom = iAfpers.valeur("PRENOM");
+  Valeur civilite = iAfpers.valeur("CIVILITE");
+  Valeur serviceIdent = iAfpers.valeur("AFSERV_IDENT");
+  Table iGapappor(this, "GESCOM", "I_GAPAPPOR", "");
+  EvtParamVal appor{val(code)};
+  if (appeler("GAPAPPOR", "LECTURE_CODE", appor, "*1")) return iGapappor.valeur("IDENT").toChaine();
+
+  EvtParamVal titre{civilite};
+  std::string civiliteTexte;
+  if (appeler("SVCCIVIL", "LECTURE_CODE", titre, "*1")) {
+    civiliteTexte = Table(this, "VOVOVA", "I_SVCCIVIL", "").valeur("DESIG").toChaine();
+  }
+  EvtParamVal service{serviceIdent};
+  std::string serviceTexte;
+  if (appeler("AFSERV", "LECTURE", service, "*1")) {
+    serviceTexte = Table(this, "VOVOVA", "I_AFSERV", "").valeur("DESIG").toChaine();
+  }
+  Field& ident = chaine("V_GAPAPPOR_IDENT");
+  EvtParamRef attribue{val("GESCOM"), val("NUMEROS"), val("GAPAPPOR"), val(""), val(10), ref(ident)};
+  if (!appeler("ZUMNDOC", "ATTRIBUE_NUMERO", attribue)) return "";
+  EvtParamRef valide{val("GESCOM"), val("NUMEROS"), val("GAPAPPOR"), val(""), val(10), ref(ident)};
+  if (!appeler("ZUMNDOC", "VALIDE_NUMERO", valide)) return "";
+  session().memoire("I_GAPAPPOR").clear();
+  iGapappor.ecrire("IDENT", ident.value());
+  iGapappor.ecrire("CODE", Valeur::chaine(code));
+  iGapappor.ecrire("NOM", nom);
+  iGapappor.ecrire("PRENOM", prenom);
+  iGapappor.ecrire("CIVILITE", Valeur::chaine(civiliteTexte));
+  iGapappor.ecrire("SERVICE", Valeur::chaine(serviceTexte));
+  EvtParamVal ecriture{ident.value()};
+  if (!appeler("GAPAPPOR", "ECRITURE", ecriture)) return "";
+  return ident.text();
+}
+
+void QUARVOImport_generer::completerEntete() {
+  pieces_.ecrire("DESIG", stagedValeur("REFERENCE"));
+  pieces_.ecrire("ORIGINE", stagedValeur("ORIGINE"));
+  if (kind_.numeroEntete) pieces_.ecrire("NUMERO", stagedValeur("NUMERO"));
+  pieces_.ecrire("NUMERO_DOC", stagedValeur("NUMERO_DOC"));
+  std::string requester = demandeur(staged("DEMANDEUR"));
+  if (!requester.empty()) pieces_.ecrire("GAPAPPOR_IDENT", Valeur::chaine(requester));
+}
+
+void QUARVOImport_generer::solder() {
+  if (kind_.solde == Solde::Jamais || toEntier(stagedValeur("SOLDE")) != 1) return;
+  if (vPieceIdent_.text().empty()) return;
+  if (pieces_.chercher(3, "IDENT", '=', vPieceIdent_.value()) != 0) return;
+  if (kind_.solde == Solde::SaufSoldee && toEntier(pieces_.valeur("SOLDEE")) == 1) return;
+  EvtParamVal solde{val(kind_.entete), vPieceIdent_.value()};
+  appelerModule("", "QUARVO", "QUARVO-SOLDER", &solde);
+}
+
+void QUARVOImport_generer::fin1(Evt*) {
+  if (vCreerPiece_.text() != "1") {
+    if (!vPieceIdent_.text().empty()) {
+      // A piece of an earlier run: settled when asked, in a transaction of its own.
+      Transaction tx(session().db());
+      solder();
+      tx.commit();
+    }
+    return;
+  }
+  EvtParamVal none;
+  if (!protocole("FIN_PIECE_GENEREE", none)) return abandonnerPiece();
+  if (pieces_.chercher(3, "IDENT", '=', vPieceIdent_.value()) != 0) return abandonnerPiece();
+  completerEntete();
+  if (pieces_.modifier() != 0) return abandonnerPiece();
+  if (kind_.echeances) {
+    EvtParamVal echeance{pieces_.valeur("IDENT"),         pieces_.valeur("NUMERO_DOC"),
+                         pieces_.valeur("GCPFOUR_IDENT"), pieces_.valeur("GCPREG_IDENT"),
+                         pieces_.valeur("DATE_CREATION"), pieces_.valeur("NET_A_PAYER"),
+                         val(1)};
+    appeler("GAPECH", "CREER_DEFAUT", echeance);
+  }
+  EvtParamVal valide{pieces_.valeur("IDENT")};
+  if (!protocole("VALIDE_DOCUMENT", valide)) return abandonnerPiece();
+  if (kind_.echeances) {
+    EvtParamVal mouvement{val(kind_.entete), pieces_.valeur("IDENT")};
+    appeler("AFMOUV", "GENERER_PIECE", mouvement);
+    EvtParamVal maj{val(kind_.entete), pieces_.valeur("IDENT")};
+    appeler("AFMOUV", "MAJ_PIECE_GENEREE", maj);
+  }
+  solder();
+  if (piece_) {
+    piece_->commit();
+    piece_.reset();
+    ++piecesEcrites;
+  }
+}
+
+void QUARVOImport_generer::message_erreur(Evt* evt) {
+  vTexte_.set("");
+  EvtParamRef texte{ref(vTexte_)};
+  appeler(kind_.entete, "TEXTE_ERREUR_GENERATION", texte);
+  EvtParamRef message{Arg(vTexte_.value()), ref(vChoix_)};
+  appelerProcedure("*", "COMMUN", "INTERFACE", "MESS_ERREUR", &message, -1);
+  pErreur_.set(int64_t{1});
+  erreurMethode(0, evt);
+}
+
+void QUARVOImport_generer::sortie(Evt* evt) {
+  sortieFaite_ = true;
+  piece_.reset();  // a piece left open by a fault is not kept half-written
+  EvtParamVal none;
+  // The bracket is closed only when it was opened: an empty file opens none.
+  if (generationOuverte_) protocole("FIN_GENERATION", none);
+  if (boiteOuverte_) appelerProcedure("*", "COMMUN", "INTERFACE", "BOITE_SORTIR", &none, -1);
+  Automate::sortie(evt);
+}
+
+}  // namespace quarvo
