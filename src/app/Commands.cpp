@@ -14,6 +14,7 @@
 #include "app/GenerateCommand.h"
 #include "app/ImportCommand.h"
 #include "app/ImputeCommand.h"
+#include "app/ReportCommand.h"
 #include "app/Tsv.h"
 #include "app/Workspace.h"
 #include "host/UException.h"
@@ -148,6 +149,34 @@ int runCommandLine(int argc, char** argv, std::ostream& out, std::ostream& err) 
   ImportOptions importOptions;
   auto* import = addImportCommand(cli, importOptions);
 
+  ReportOptions reportOptions;
+  std::string pdfFile;
+  std::string exportFile;
+  bool noBefore = false;
+  auto* report = cli.add_subcommand("report", "Print or export the purchase follow-up report");
+  report->add_option("--from", reportOptions.from,
+                     "First day (dd/mm/yyyy); default: the company's current month");
+  report->add_option("--to", reportOptions.to, "Last day; default: end of that month");
+  auto* projectOption =
+      report->add_option("--project", reportOptions.project, "One project by code");
+  report->add_option("--budget", reportOptions.budget, "One budget by identifier")
+      ->excludes(projectOption);
+  report->add_option("--criterion", reportOptions.criterion,
+                     "Grouping: AFCLIE AFETAB AFSERV AFRPS1 AFRPS2 AFCRI1..5");
+  report->add_option("--options", reportOptions.options,
+                     "Five 0/1: page per project, lines, pieces, recap 1, recap 2 (11100)");
+  report->add_option("--states", reportOptions.states,
+                     "Budget states T|A|NC|NA|C, ':O' for closed budgets");
+  report->add_flag("--no-before", noBefore, "Leave out pieces dated before the period");
+  auto* printOption =
+      report->add_option("--print", pdfFile, "PDF file (default: under the database folder)")
+          ->expected(0, 1);
+  auto* exportOption =
+      report
+          ->add_option("--export", exportFile,
+                       "Export file; .xlsx gives a workbook (default: the saved one)")
+          ->expected(0, 1);
+
   GenerateOptions genOptions;
   auto* gen = cli.add_subcommand(
       "gen", "Add a synthetic data set (on a demo database) for benchmarks and large tests");
@@ -214,6 +243,12 @@ int runCommandLine(int argc, char** argv, std::ostream& out, std::ostream& err) 
       }
       dumpTsv(session, table, filters, out);
       return 0;
+    }
+    if (*report) {
+      reportOptions.beforePeriod = !noBefore;
+      if (*printOption) reportOptions.print = pdfFile;
+      if (*exportOption) reportOptions.exportFile = exportFile;
+      return runReport(session, reportOptions, out);
     }
     if (*import) return runImport(session, importOptions, out);
     if (*gen) return runGenerate(session, genOptions, out);

@@ -12,6 +12,7 @@
 #include "app/FiguresCommand.h"
 #include "app/ImportCommand.h"
 #include "app/ImputeCommand.h"
+#include "app/ReportCommand.h"
 #include "app/Workspace.h"
 #include "host/automate/Automate.h"
 #include "host/table/Champ.h"
@@ -165,6 +166,11 @@ int runDemo(const std::string& dirText, std::ostream& out, std::ostream& err) {
       << after[0] - before[0] << " quote request(s), " << after[1] - before[1] << " order(s), "
       << after[2] - before[2] << " goods-received note(s), " << after[3] - before[3]
       << " invoice(s).\n";
+
+  out << "\n7. The purchase follow-up report of the demo projects, printed and exported:\n";
+  ReportPaths report = reportDemo(s, dir);
+  out << "   printed:  " << report.pdf.string() << "\n   exported: " << report.exported.string()
+      << "\n";
 
   out << "\nThe database stays in " << file.string() << "; look at it with for example\n"
       << "   quarvo --db " << file.string() << " dump AFLBUD\n"

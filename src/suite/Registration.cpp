@@ -2,7 +2,9 @@
 // name "<MODULE>-INTERFACE". Table-backed modules share one implementation.
 #include "host/automate/Automate.h"
 #include "host/automate/Registry.h"
+#include "suite/Action.h"
 #include "suite/Afaffa.h"
+#include "suite/Afdroi.h"
 #include "suite/Afmenu.h"
 #include "suite/Afmouv.h"
 #include "suite/Afpara.h"
@@ -67,8 +69,8 @@ const Module gcpcompt("", "GCPCOMPT-INTERFACE", &fabriquer<Gcpcompt>, false, "")
 const Module gcptcfg("", "GCPTCFG-INTERFACE", &fabriquer<Gcpcompt>, false, "");
 const Module gcptva("", "GCPTVA-INTERFACE", &fabriquer<Gcptva>, false, "");
 const Module sysascii("", "SYSASCII-INTERFACE", &fabriquer<Sysascii>, false, "");
-const Module action("", "ACTION-INTERFACE", &fabriquer<TableInterface>, false, "");
-const Module afdroi("", "AFDROI-INTERFACE", &fabriquer<TableInterface>, false, "");
+const Module action("", "ACTION-INTERFACE", &fabriquer<Action>, false, "");
+const Module afdroi("", "AFDROI-INTERFACE", &fabriquer<Afdroi>, false, "");
 const Module afetab("", "AFETAB-INTERFACE", &fabriquer<TableInterface>, false, "");
 const Module afrps1("", "AFRPS1-INTERFACE", &fabriquer<TableInterface>, false, "");
 const Module afrps2("", "AFRPS2-INTERFACE", &fabriquer<TableInterface>, false, "");

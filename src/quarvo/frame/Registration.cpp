@@ -16,6 +16,9 @@
 #include "quarvo/imputation/QUARVOPointer_pieces.h"
 #include "quarvo/links/QUARVOExiste_chainage_aval.h"
 #include "quarvo/links/QUARVOInterface.h"
+#include "quarvo/report/QUARVOExpetat1.h"
+#include "quarvo/report/QUARVOImpetat1.h"
+#include "quarvo/report/QUARVOSeletat1.h"
 
 namespace quarvo {
 namespace {
@@ -46,6 +49,9 @@ const Source sourceC("QUARVO", nullptr);
 
 // Unit D: follow-up report.
 const Global globalD("COMMUN", "QUARVO");
+const Module expetat1("", "QUARVO-EXPETAT1", &fabriquer<QUARVOExpetat1>, false, "");
+const Module impetat1("", "QUARVO-IMPETAT1", &fabriquer<QUARVOImpetat1>, false, "");
+const Module seletat1("", "QUARVO-SELETAT1", &fabriquer<QUARVOSeletat1>, false, "");
 const Source sourceD("QUARVO", nullptr);
 
 // Unit E: import and settling.
