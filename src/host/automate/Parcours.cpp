@@ -64,6 +64,10 @@ void Parcours::executer(Evt* evt) {
   }
   if (!termine()) raise("FIN", e);
   sortir();
+  if (!sortieFaite_ && hasBranch("SORTIE")) {
+    sortieFaite_ = true;
+    raise("SORTIE", e);
+  }
 }
 
 }  // namespace quarvo::host

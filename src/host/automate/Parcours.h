@@ -2,7 +2,9 @@
 // order "POUR_TOUT", with level-1 breaks ("DEBUT1" before the first row of a group, "FIN1" after
 // its last) on the break column, then "FIN". The automaton names its table with `nomTable`,
 // its criteria with `critere` and its order and break with `plan`. "POUR_TOUT" reads the current
-// row through the traversal cursor `courant()`.
+// row through the traversal cursor `courant()`. "SORTIE" (when bound) runs once at the very end,
+// whether the traversal ended by itself or a handler ended it early; a class whose own handlers
+// raise "SORTIE" earlier says so with `sortieFaite`.
 #pragma once
 
 #include <memory>
@@ -23,6 +25,8 @@ class Parcours : public Automate {
   Table& courant();
   // Stops the traversal after the current row.
   void arreter() { stop_ = true; }
+  // The exit handler has run: it is not raised again at the end.
+  void sortieFaite() { sortieFaite_ = true; }
   void executer(Evt* evt) override;
 
  private:
@@ -31,6 +35,7 @@ class Parcours : public Automate {
   std::string break_;
   std::vector<Criterion> criteria_;
   bool stop_ = false;
+  bool sortieFaite_ = false;
 };
 
 }  // namespace quarvo::host

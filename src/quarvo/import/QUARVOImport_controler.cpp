@@ -49,14 +49,6 @@ QUARVOImport_controler::QUARVOImport_controler(Evt* evt, const DifferencesContro
 
 QUARVOImport_controler::~QUARVOImport_controler() = default;
 
-void QUARVOImport_controler::executer(Evt* evt) {
-  Parcours::executer(evt);
-  // The exit handler runs once, whether the traversal ended by itself or was ended early.
-  if (!sortieFaite_) {
-    EvtParamVal none;
-    raise("SORTIE", evt != nullptr ? evt : &none);
-  }
-}
 
 std::string QUARVOImport_controler::staged(const char* column) {
   return courant().valeur(column).toChaine();
@@ -221,7 +213,7 @@ void QUARVOImport_controler::ecrire_erreur(Evt* evt) {
 }
 
 void QUARVOImport_controler::sortie(Evt* evt) {
-  sortieFaite_ = true;
+  sortieFaite();
   EvtParamVal none;
   appelerProcedure("", "", "", "SUPPRIMER_ERREURS", &none, 0);
   appelerProcedure("*", "COMMUN", "INTERFACE", "BOITE_SORTIR", &none, -1);

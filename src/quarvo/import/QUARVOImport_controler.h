@@ -53,7 +53,6 @@ class QUARVOImport_controler : public host::Parcours {
   void sortie(host::Evt* evt) override;
   void ecrire_erreur(host::Evt* evt);
   void supprimer_erreurs(host::Evt* evt);
-  void executer(host::Evt* evt) override;
 
  private:
   std::string staged(const char* column);
@@ -86,7 +85,6 @@ class QUARVOImport_controler : public host::Parcours {
   std::string pieceCourante_;   // "NUMERO_DOC" of the row being checked
   bool ligneEnErreur_ = false;
   int64_t pasJauge_ = 1;
-  bool sortieFaite_ = false;
   // Credit-note lines added in this run, with the invoice number they come from.
   std::vector<std::pair<std::string, host::RowId>> avoirs_;
 };

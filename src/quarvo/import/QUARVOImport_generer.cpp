@@ -86,13 +86,6 @@ QUARVOImport_generer::QUARVOImport_generer(Evt* evt, const DifferencesGeneration
 
 QUARVOImport_generer::~QUARVOImport_generer() = default;
 
-void QUARVOImport_generer::executer(Evt* evt) {
-  Parcours::executer(evt);
-  if (!sortieFaite_) {
-    EvtParamVal none;
-    raise("SORTIE", evt != nullptr ? evt : &none);
-  }
-}
 
 Valeur QUARVOImport_generer::stagedValeur(const char* column) {
   auto i = courant().store().schema().index(column);
@@ -539,7 +532,7 @@ void QUARVOImport_generer::message_erreur(Evt* evt) {
 }
 
 void QUARVOImport_generer::sortie(Evt* evt) {
-  sortieFaite_ = true;
+  sortieFaite();
   piece_.reset();  // a piece left open by a fault is not kept half-written
   EvtParamVal none;
   // The bracket is closed only when it was opened: an empty file opens none.

@@ -73,7 +73,6 @@ class QUARVOImport_generer : public host::Parcours {
   void fin1(host::Evt* evt) override;
   void sortie(host::Evt* evt) override;
   void message_erreur(host::Evt* evt);
-  void executer(host::Evt* evt) override;
 
  private:
   // A call of the piece module's generation protocol; on failure runs "MESSAGE_ERREUR".
@@ -131,7 +130,6 @@ class QUARVOImport_generer : public host::Parcours {
   host::Row ligne_;                           // the staged row last read, as it was
   bool generationOuverte_ = false;
   bool boiteOuverte_ = false;
-  bool sortieFaite_ = false;
   std::string fournisseurIdent_;
   std::string regime_;
   int64_t saisieAna_ = 0;

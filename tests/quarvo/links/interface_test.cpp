@@ -133,6 +133,16 @@ TEST_F(InterfaceTest, DeletedPieceLeavesNoLinkAndNoAmountBehind) {
   EXPECT_EQ(count("QUARVO", ""), 0);
 }
 
+TEST_F(InterfaceTest, LectureLeavesTheLinkRowInItsInterfaceRecord) {
+  mixedLinks();
+  EXPECT_EQ(call("LECTURE", {val("0000005003")}), 0);
+  Table record(nullptr, "VOVOVA", "I_QUARVO", "");
+  EXPECT_EQ(record.valeur("PIECE").toChaine(), "FF26000001");
+  EXPECT_EQ(record.valeur("CLE_COMPO").toChaine(), std::string(kLine) + "|GAPEFAC|FF26000001");
+  EXPECT_EQ(call("LECTURE", {val("0000009999")}), 1);
+  EXPECT_EQ(record.valeur("PIECE").toChaine(), "");
+}
+
 TEST_F(InterfaceTest, RightsAndFolderChecksBeforeAnythingOpens) {
   EXPECT_EQ(call("VERIF_DROITS", {val("C")}), 0);
   EXPECT_EQ(call("VERIF_DROITS", {}), 0);  // "I" by default
