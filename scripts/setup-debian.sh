@@ -3,7 +3,7 @@
 set -euo pipefail
 packages=(g++ cmake ninja-build pkg-config libsqlite3-dev sqlite3 libfmt-dev libcli11-dev
           libgtest-dev libgmock-dev libcairo2-dev libpango1.0-dev libxlsxwriter-dev
-          poppler-utils unzip libbenchmark-dev)
+          poppler-utils unzip libbenchmark-dev libjemalloc-dev)
 missing=()
 for p in "${packages[@]}"; do
   dpkg-query -W -f='${Status}' "$p" 2>/dev/null | grep -q "install ok installed" || missing+=("$p")

@@ -291,9 +291,18 @@ SqliteDatabase::SqliteDatabase(const std::filesystem::path& path, bool create) :
   sqlite3_extended_result_codes(db_, 1);
   // Batches read the same reference rows again and again: a page cache of 64 MiB and a mapped
   // file keep those reads in memory instead of going back to the file each time.
-  execScript(
-      "PRAGMA journal_mode = WAL; PRAGMA synchronous = NORMAL; PRAGMA foreign_keys = OFF; "
-      "PRAGMA cache_size = -65536; PRAGMA mmap_size = 268435456;");
+  try {
+    execScript(
+        "PRAGMA journal_mode = WAL; PRAGMA synchronous = NORMAL; PRAGMA foreign_keys = OFF; "
+        "PRAGMA cache_size = -65536; PRAGMA mmap_size = 268435456;");
+  } catch (...) {
+    // A file that is not a database fails here: the destructor will not run, so close now.
+    for (auto& [sql, st] : statements_) sqlite3_finalize(st);
+    statements_.clear();
+    sqlite3_close(db_);
+    db_ = nullptr;
+    throw;
+  }
 }
 
 SqliteDatabase::~SqliteDatabase() {
