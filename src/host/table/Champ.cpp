@@ -6,10 +6,18 @@ namespace quarvo::host {
 
 Champ::Champ(std::string column, Table& table, int) : column_(std::move(column)), table_(table) {}
 
-int64_t Champ::entier() const { return toEntier(valeur()); }
-double Champ::dbl() const { return toDouble(valeur()); }
-Monnaie Champ::monnaie() const { return toMonnaie(valeur()); }
-Date Champ::date() const { return toDate(valeur()); }
+int64_t Champ::entier() const {
+  return toEntier(valeur());
+}
+double Champ::dbl() const {
+  return toDouble(valeur());
+}
+Monnaie Champ::monnaie() const {
+  return toMonnaie(valeur());
+}
+Date Champ::date() const {
+  return toDate(valeur());
+}
 
 std::vector<std::string> splitList(const std::string& stored) {
   std::vector<std::string> items;

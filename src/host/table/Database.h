@@ -6,8 +6,10 @@
 // Transaction is a savepoint of the outer one.
 #pragma once
 
+#include <chrono>
 #include <filesystem>
 #include <memory>
+#include <optional>
 #include <string>
 #include <vector>
 
@@ -46,6 +48,38 @@ class Transaction {
  private:
   Database& db_;
   bool done_ = false;
+};
+
+// Groups the many small units of a long batch into few commits.
+//
+// Each unit keeps its own Transaction, which inside the group is a savepoint: a unit is still
+// written whole or not at all. The group commits once `unites` units have ended or `delai` has
+// passed, whichever comes first, so the pages every unit touches (counters, budget lines,
+// indexes) are written once per group instead of once per unit, and other writers wait at most
+// about `delai` for the lock. A crash loses the units ended since the last group commit, never
+// part of one: a batch that skips what already exists simply writes them again on its rerun.
+// The group is open from construction until terminer(); the destructor rolls back what an
+// unfinished group holds.
+class TransactionsGroupees {
+ public:
+  explicit TransactionsGroupees(Database& db, int unites = 500,
+                                std::chrono::milliseconds delai = std::chrono::milliseconds(200));
+  TransactionsGroupees(const TransactionsGroupees&) = delete;
+  TransactionsGroupees& operator=(const TransactionsGroupees&) = delete;
+  // Called after a unit's own transaction committed or rolled back; may commit the group and
+  // open the next one. REQUIRES: terminer() has not run.
+  void uniteTerminee();
+  // Commits what the group holds and closes it. Idempotent.
+  void terminer();
+
+ private:
+  using Clock = std::chrono::steady_clock;
+  Database& db_;
+  int unites_;
+  std::chrono::milliseconds delai_;
+  int ouvertes_ = 0;
+  Clock::time_point debut_;
+  std::optional<Transaction> groupe_;
 };
 
 }  // namespace quarvo::host

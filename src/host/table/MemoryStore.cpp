@@ -125,7 +125,7 @@ RowId MemoryStore::insert(const Row& row) {
   return id;
 }
 
-void MemoryStore::update(RowId id, const Row& row) {
+void MemoryStore::update(RowId id, const Row& row, const std::vector<bool>&) {
   auto it = rows_.find(id);
   if (it == rows_.end()) return;
   indexRemove(id, it->second);

@@ -19,7 +19,8 @@ bool matches(const Valeur& value, const Criterion& c);
 class MemoryStore : public TableStore {
  public:
   explicit MemoryStore(std::string name) : name_(std::move(name)) {}
-  MemoryStore(std::string name, const TableSchema& layout) : name_(std::move(name)), schema_(layout) {}
+  MemoryStore(std::string name, const TableSchema& layout)
+      : name_(std::move(name)), schema_(layout) {}
 
   const std::string& name() const override { return name_; }
   TableSchema& schema() override { return schema_; }
@@ -27,7 +28,7 @@ class MemoryStore : public TableStore {
   std::vector<RowId> select(const std::vector<Criterion>& criteria) override;
   bool fetch(RowId id, Row& out) override;
   RowId insert(const Row& row) override;
-  void update(RowId id, const Row& row) override;
+  void update(RowId id, const Row& row, const std::vector<bool>& changees) override;
   void remove(RowId id) override;
   int64_t removeAll(const std::vector<Criterion>& criteria) override;
   int64_t count(const std::vector<Criterion>& criteria) override;

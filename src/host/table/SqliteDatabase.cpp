@@ -8,12 +8,6 @@
 
 namespace quarvo::host {
 
-void Transaction::commit() {
-  if (done_) throw UException("transaction committed twice");
-  db_.commit();
-  done_ = true;
-}
-
 namespace {
 
 std::string sqlIdent(const std::string& identifier) {
@@ -75,6 +69,18 @@ class SqliteStore : public TableStore {
     fetchSql_ = "SELECT " + cols + " FROM " + sqlIdent(name_) + " WHERE rowid = ?";
     insertSql_ = "INSERT INTO " + sqlIdent(name_) + " (" + cols + ") VALUES (" + marks + ")";
     updateSql_ = "UPDATE " + sqlIdent(name_) + " SET " + sets + " WHERE rowid = ?";
+    sqlite3_stmt* tr =
+        db_.prepare("SELECT COUNT(*) FROM sqlite_master WHERE type = 'trigger' AND tbl_name = ?");
+    Reset resetTr{tr};
+    sqlite3_bind_text(tr, 1, name_.c_str(), -1, SQLITE_TRANSIENT);
+    declencheurs_ = sqlite3_step(tr) == SQLITE_ROW && sqlite3_column_int64(tr, 0) > 0;
+    colonnesCritere_.assign(schema_.columns().size(), false);
+  }
+
+  // Forgets every remembered selection and row.
+  void oublier() {
+    selections_.clear();
+    lignes_.clear();
   }
 
   bool exists() const { return !schema_.columns().empty(); }
@@ -83,6 +89,18 @@ class SqliteStore : public TableStore {
   bool extensible() const override { return false; }
 
   std::vector<RowId> select(const std::vector<Criterion>& criteria) override {
+    std::string cle;
+    if (db_.memoireActive()) {
+      cle = cleSelection(criteria);
+      auto it = selections_.find(cle);
+      if (it != selections_.end()) return it->second;
+    }
+    std::vector<RowId> ids = lireSelection(criteria);
+    if (!cle.empty() && ids.size() <= kSelectionRetenue) retenir(criteria, cle, ids);
+    return ids;
+  }
+
+  std::vector<RowId> lireSelection(const std::vector<Criterion>& criteria) {
     std::vector<Valeur> binds;
     std::string sql = "SELECT rowid FROM " + sqlIdent(name_) + where(criteria, binds) + order_;
     sqlite3_stmt* st = db_.prepare(sql);
@@ -96,6 +114,20 @@ class SqliteStore : public TableStore {
   }
 
   bool fetch(RowId id, Row& out) override {
+    auto retenue = lignes_.end();
+    if (db_.memoireActive()) {
+      retenue = lignes_.find(id);
+      if (retenue != lignes_.end() && retenue->second) {
+        out = *retenue->second;
+        return true;
+      }
+    }
+    if (!lireLigne(id, out)) return false;
+    if (retenue != lignes_.end()) retenue->second = out;
+    return true;
+  }
+
+  bool lireLigne(RowId id, Row& out) {
     sqlite3_stmt* st = db_.prepare(fetchSql_);
     Reset reset{st};
     sqlite3_bind_int64(st, 1, id);
@@ -110,6 +142,7 @@ class SqliteStore : public TableStore {
   }
 
   RowId insert(const Row& row) override {
+    selections_.clear();  // the new row may match any of them
     sqlite3_stmt* st = db_.prepare(insertSql_);
     Reset reset{st};
     bindRow(st, row);
@@ -117,15 +150,47 @@ class SqliteStore : public TableStore {
     return sqlite3_last_insert_rowid(db_.handle());
   }
 
-  void update(RowId id, const Row& row) override {
-    sqlite3_stmt* st = db_.prepare(updateSql_);
+  void update(RowId id, const Row& row, const std::vector<bool>& changees) override {
+    const auto& cols = schema_.columns();
+    auto changee = [&](size_t i) {
+      return changees.empty() || (i < changees.size() && changees[i]);
+    };
+    // Only the changed columns are written: SQLite then maintains only the indexes (and fires
+    // only the triggers) of those columns.
+    std::vector<size_t> ecrites;
+    for (size_t i = 0; i < cols.size(); ++i) {
+      if (changee(i)) ecrites.push_back(i);
+    }
+    if (ecrites.empty()) return;
+    auto retenue = lignes_.find(id);
+    // A remembered selection stays right when no column it selects on changes, which a trigger
+    // might do behind our back.
+    if (declencheurs_ || retenue == lignes_.end() || !retenue->second ||
+        changeUnCritere(*retenue->second, row, ecrites)) {
+      selections_.clear();
+    }
+    if (retenue != lignes_.end()) retenue->second.reset();  // read again on its next fetch
+    sqlite3_stmt* st;
+    if (ecrites.size() == cols.size()) {
+      st = db_.prepare(updateSql_);
+    } else {
+      std::string sql = "UPDATE " + sqlIdent(name_) + " SET ";
+      for (size_t k = 0; k < ecrites.size(); ++k) {
+        if (k > 0) sql += ", ";
+        sql += sqlIdent(cols[ecrites[k]].name) + " = ?";
+      }
+      st = db_.prepare(sql + " WHERE rowid = ?");
+    }
     Reset reset{st};
-    bindRow(st, row);
-    sqlite3_bind_int64(st, static_cast<int>(schema_.columns().size()) + 1, id);
+    for (size_t k = 0; k < ecrites.size(); ++k)
+      bindColumn(st, static_cast<int>(k) + 1, row, ecrites[k]);
+    sqlite3_bind_int64(st, static_cast<int>(ecrites.size()) + 1, id);
     step(st, "update of " + name_);
   }
 
   void remove(RowId id) override {
+    selections_.clear();
+    lignes_.erase(id);
     sqlite3_stmt* st = db_.prepare("DELETE FROM " + sqlIdent(name_) + " WHERE rowid = ?");
     Reset reset{st};
     sqlite3_bind_int64(st, 1, id);
@@ -133,6 +198,7 @@ class SqliteStore : public TableStore {
   }
 
   int64_t removeAll(const std::vector<Criterion>& criteria) override {
+    oublier();
     std::vector<Valeur> binds;
     sqlite3_stmt* st = db_.prepare("DELETE FROM " + sqlIdent(name_) + where(criteria, binds));
     Reset reset{st};
@@ -152,6 +218,47 @@ class SqliteStore : public TableStore {
   }
 
  private:
+  // Selections of at most this many rows are remembered (lookups of reference rows, counters);
+  // larger ones are traversals, read once.
+  static constexpr size_t kSelectionRetenue = 64;
+  // Past this many remembered selections or rows, the table starts afresh.
+  static constexpr size_t kRetenuesMax = 4096;
+
+  static std::string cleSelection(const std::vector<Criterion>& criteria) {
+    std::string cle;
+    for (const auto& c : criteria) {
+      cle += c.column;
+      cle += '\x1f';
+      cle += c.op;
+      cle += static_cast<char>('0' + static_cast<int>(c.value.kind()));
+      cle += c.value.toChaine();
+      cle += '\x1e';
+    }
+    return cle;
+  }
+
+  void retenir(const std::vector<Criterion>& criteria, const std::string& cle,
+               const std::vector<RowId>& ids) {
+    if (selections_.size() >= kRetenuesMax || lignes_.size() >= kRetenuesMax) oublier();
+    for (const auto& c : criteria) {
+      if (auto i = schema_.index(c.column)) colonnesCritere_[*i] = true;
+    }
+    selections_.emplace(cle, ids);
+    for (RowId id : ids) lignes_.try_emplace(id);
+  }
+
+  bool changeUnCritere(const Row& avant, const Row& apres,
+                       const std::vector<size_t>& ecrites) const {
+    const auto& cols = schema_.columns();
+    for (size_t i : ecrites) {
+      if (!colonnesCritere_[i]) continue;
+      if (i >= avant.values.size() || i >= apres.values.size()) return true;
+      auto fitted = fitColumn(cols[i], apres.values[i]);
+      if (!fitted || !(*fitted == avant.values[i])) return true;
+    }
+    return false;
+  }
+
   void step(sqlite3_stmt* st, const std::string& what) {
     int rc = sqlite3_step(st);
     if (rc == SQLITE_DONE) return;
@@ -230,20 +337,24 @@ class SqliteStore : public TableStore {
   }
 
   void bindRow(sqlite3_stmt* st, const Row& row) {
-    const auto& cols = schema_.columns();
-    for (size_t i = 0; i < cols.size(); ++i) {
-      int n = static_cast<int>(i) + 1;
-      if (i >= row.values.size()) {
-        bindValue(st, n, storageForm(cols[i].kind, defaultOf(cols[i].kind)));
-        continue;
-      }
-      auto fitted = fitColumn(cols[i], row.values[i]);
-      if (!fitted) {
-        throw UException("value '" + row.values[i].toChaine() + "' does not fit column " + name_ +
-                         "." + cols[i].name);
-      }
-      bindValue(st, n, storageForm(cols[i].kind, *fitted));
+    for (size_t i = 0; i < schema_.columns().size(); ++i) {
+      bindColumn(st, static_cast<int>(i) + 1, row, i);
     }
+  }
+
+  // Binds column i of the row to parameter n, in its stored form.
+  void bindColumn(sqlite3_stmt* st, int n, const Row& row, size_t i) {
+    const ColumnInfo& col = schema_.columns()[i];
+    if (i >= row.values.size()) {
+      bindValue(st, n, storageForm(col.kind, defaultOf(col.kind)));
+      return;
+    }
+    auto fitted = fitColumn(col, row.values[i]);
+    if (!fitted) {
+      throw UException("value '" + row.values[i].toChaine() + "' does not fit column " + name_ +
+                       "." + col.name);
+    }
+    bindValue(st, n, storageForm(col.kind, *fitted));
   }
 
   static Valeur readColumn(sqlite3_stmt* st, int i, ColKind k) {
@@ -277,7 +388,25 @@ class SqliteStore : public TableStore {
   std::string fetchSql_;
   std::string insertSql_;
   std::string updateSql_;
+  // What was read inside transactions while no other connection changed the file (see
+  // SqliteDatabase::memoireActive): selections by their criteria, and the rows they gave (a row
+  // is remembered once fetched; an empty entry is a row to remember on its next fetch).
+  std::unordered_map<std::string, std::vector<RowId>> selections_;
+  std::unordered_map<RowId, std::optional<Row>> lignes_;
+  std::vector<bool> colonnesCritere_;  // columns some remembered selection selects on
+  bool declencheurs_ = false;          // the table has triggers
 };
+
+namespace {
+// A piece written inside a group of pieces is a savepoint: the pages it changes are first copied
+// to the statement journal, which SQLite spills to a temporary file after 64 KiB. Keeping it in
+// memory saves a file write per page; it is emptied whenever no savepoint is open, so it holds
+// at most one piece's pages. Settings of this kind must be made before SQLite initialises.
+[[maybe_unused]] const bool journauxEnMemoire = [] {
+  sqlite3_config(SQLITE_CONFIG_STMTJRNL_SPILL, -1);
+  return true;
+}();
+}  // namespace
 
 SqliteDatabase::SqliteDatabase(const std::filesystem::path& path, bool create) : path_(path) {
   int flags = SQLITE_OPEN_READWRITE | (create ? SQLITE_OPEN_CREATE : 0);
@@ -343,7 +472,16 @@ std::vector<std::string> SqliteDatabase::tableNames() {
   return names;
 }
 
+void SqliteDatabase::oublierLectures() {
+  for (auto& [name, store] : stores_) store->oublier();
+}
+
 void SqliteDatabase::execScript(const std::string& sql) {
+  oublierLectures();  // a script may change anything
+  executer(sql);
+}
+
+void SqliteDatabase::executer(const std::string& sql) {
   char* err = nullptr;
   if (sqlite3_exec(db_, sql.c_str(), nullptr, nullptr, &err) != SQLITE_OK) {
     std::string msg = err ? err : "unknown error";
@@ -354,9 +492,16 @@ void SqliteDatabase::execScript(const std::string& sql) {
 
 void SqliteDatabase::begin() {
   if (depth_ == 0) {
-    execScript("BEGIN IMMEDIATE");
+    executer("BEGIN IMMEDIATE");
+    // What was remembered from earlier transactions holds unless another connection has
+    // committed since: SQLite's data version changes exactly then.
+    sqlite3_stmt* st = prepare("PRAGMA data_version");
+    Reset reset{st};
+    int64_t version = sqlite3_step(st) == SQLITE_ROW ? sqlite3_column_int64(st, 0) : -1;
+    if (version != dataVersion_ || version < 0) oublierLectures();
+    dataVersion_ = version;
   } else {
-    execScript("SAVEPOINT sp" + std::to_string(depth_));
+    executer("SAVEPOINT sp" + std::to_string(depth_));
   }
   ++depth_;
 }
@@ -364,11 +509,12 @@ void SqliteDatabase::begin() {
 void SqliteDatabase::commit() {
   if (depth_ == 0) throw UException("commit without a transaction");
   --depth_;
-  execScript(depth_ == 0 ? std::string("COMMIT") : "RELEASE sp" + std::to_string(depth_));
+  executer(depth_ == 0 ? std::string("COMMIT") : "RELEASE sp" + std::to_string(depth_));
 }
 
 void SqliteDatabase::rollback() {
   if (depth_ == 0) return;
+  oublierLectures();  // rows read or written in the undone work are no longer true
   --depth_;
   if (depth_ == 0) {
     char* err = nullptr;

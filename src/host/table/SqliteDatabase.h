@@ -5,8 +5,15 @@
 // none), TIME_TEXT, DECIMAL_LIST_TEXT and DATE_LIST_TEXT (values joined by ';'). Every value is
 // bound as a parameter; identifiers are checked against the schema before they reach SQL text.
 // Several processes may share one file: writers wait for each other (busy timeout).
+//
+// Inside a transaction, small selections and the rows they give are remembered per table and
+// answered from memory when asked again: a batch looks up the same reference rows for every
+// line. A write to a table forgets its selections (and the written row); a rollback or a script
+// forgets everything; so does a new transaction when another connection committed meanwhile.
+// Outside transactions every read goes to the file.
 #pragma once
 
+#include <cstdint>
 #include <map>
 #include <unordered_map>
 
@@ -40,11 +47,18 @@ class SqliteDatabase : public Database {
   sqlite3_stmt* prepare(const std::string& sql);
   sqlite3* handle() { return db_; }
   [[noreturn]] void fail(const std::string& what);
+  // Reads may be answered from what the stores remember: only inside a transaction, where no
+  // other connection can change the file.
+  bool memoireActive() const { return depth_ > 0; }
 
  private:
   std::filesystem::path path_;
   sqlite3* db_ = nullptr;
+  void executer(const std::string& sql);
+  void oublierLectures();
+
   int depth_ = 0;
+  int64_t dataVersion_ = -1;
   std::unordered_map<std::string, sqlite3_stmt*> statements_;
   std::map<std::string, std::unique_ptr<SqliteStore>> stores_;
 };

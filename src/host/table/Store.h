@@ -69,7 +69,9 @@ class TableStore {
   virtual std::vector<RowId> select(const std::vector<Criterion>& criteria) = 0;
   virtual bool fetch(RowId id, Row& out) = 0;
   virtual RowId insert(const Row& row) = 0;
-  virtual void update(RowId id, const Row& row) = 0;
+  // Writes the columns flagged in `changees` (those the caller changed since it read the row);
+  // an empty mask writes every column.
+  virtual void update(RowId id, const Row& row, const std::vector<bool>& changees) = 0;
   virtual void remove(RowId id) = 0;
   virtual int64_t removeAll(const std::vector<Criterion>& criteria) = 0;
   virtual int64_t count(const std::vector<Criterion>& criteria) = 0;

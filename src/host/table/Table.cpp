@@ -7,8 +7,8 @@
 
 namespace quarvo::host {
 
-Table::Table(Automate* owner, std::string base, std::string name, std::string context,
-             const char*, const char*, char, int)
+Table::Table(Automate* owner, std::string base, std::string name, std::string context, const char*,
+             const char*, char, int)
     : owner_(owner),
       base_(std::move(base)),
       name_(std::move(name)),
@@ -17,7 +17,9 @@ Table::Table(Automate* owner, std::string base, std::string name, std::string co
   if (owner_ != nullptr) owner_->enregistrerTable(this);
 }
 
-Session& Table::session() { return owner_ != nullptr ? owner_->session() : Session::current(); }
+Session& Table::session() {
+  return owner_ != nullptr ? owner_->session() : Session::current();
+}
 
 TableStore& Table::store() {
   if (store_ == nullptr) {
@@ -51,6 +53,7 @@ int Table::ouvrir() {
 
 void Table::load(RowId id) {
   current_ = id;
+  changees_.clear();
   if (!store().fetch(id, buffer_)) current_ = 0;
 }
 
@@ -96,12 +99,14 @@ void Table::preparer() {
   const auto& cols = store().schema().columns();
   buffer_.values.clear();
   for (const auto& c : cols) buffer_.values.push_back(defaultOf(c.kind));
+  changees_.clear();
 }
 
 int Table::inserer() {
   if (isRecord_) return 1;
   try {
     current_ = store().insert(buffer_);
+    changees_.clear();
   } catch (const ConstraintError&) {
     return 1;
   }
@@ -112,7 +117,10 @@ int Table::modifier() {
   if (isRecord_) return 0;
   if (current_ == 0) return 1;
   try {
-    store().update(current_, buffer_);
+    // A full-width mask: an empty one would mean every column.
+    changees_.resize(store().schema().columns().size(), false);
+    store().update(current_, buffer_, changees_);
+    changees_.clear();
   } catch (const ConstraintError&) {
     return 1;
   }
@@ -138,7 +146,9 @@ int64_t Table::supprimerTout() {
   return store().removeAll(criteria_);
 }
 
-int64_t Table::compter() { return store().count(criteria_); }
+int64_t Table::compter() {
+  return store().count(criteria_);
+}
 
 const Row& Table::ligne() {
   if (isRecord_) return static_cast<MemoryStore&>(store()).firstRow();
@@ -175,6 +185,10 @@ bool Table::ecrire(const std::string& column, const Valeur& value) {
     }
   }
   row.values[*i] = std::move(*fitted);
+  if (!isRecord_) {
+    if (changees_.size() <= *i) changees_.resize(s.schema().columns().size(), false);
+    changees_[*i] = true;
+  }
   return true;
 }
 

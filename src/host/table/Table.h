@@ -87,6 +87,7 @@ class Table {
   size_t position_ = 0;  // next index of the selection for mode 1
   RowId current_ = 0;
   Row buffer_;
+  std::vector<bool> changees_;  // columns written since the row was read or prepared
   char lock_ = 0;
 };
 

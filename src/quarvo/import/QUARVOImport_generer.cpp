@@ -86,7 +86,6 @@ QUARVOImport_generer::QUARVOImport_generer(Evt* evt, const DifferencesGeneration
 
 QUARVOImport_generer::~QUARVOImport_generer() = default;
 
-
 Valeur QUARVOImport_generer::stagedValeur(const char* column) {
   auto i = courant().store().schema().index(column);
   if (!i || *i >= ligne_.values.size()) return Valeur();
@@ -145,6 +144,10 @@ void QUARVOImport_generer::debut(Evt* evt) {
     vCritereAchat_.assign(iAfpara_.valeur("PARAM1"));
   }
 
+  // Under fault injection every piece is committed on its own, so that the pieces before the
+  // crash are on disk and the crash falls in the middle of a piece, the case to prove.
+  lot_ = limite_ >= 0 ? std::make_unique<TransactionsGroupees>(session().db(), 1)
+                      : std::make_unique<TransactionsGroupees>(session().db());
   EvtParamRef generation{ref(vCodePartage_), val("U")};
   generationOuverte_ = protocole("DEBUT_GENERATION", generation);
 
@@ -185,6 +188,7 @@ void QUARVOImport_generer::abandonnerPiece() {
 void QUARVOImport_generer::debut1(Evt*) {
   ligne_ = courant().ligne();
   piece_.reset();
+  if (lot_) lot_->uniteTerminee();  // the previous piece has ended
   vCreerPiece_.set("1");
   vPieceIdent_.set("");
   std::string numero = staged("NUMERO_DOC");
@@ -202,8 +206,8 @@ void QUARVOImport_generer::debut1(Evt*) {
   regime_ = iGcpfour_.valeur("GCPREGM_IDENT").toChaine();
 
   piece_ = std::make_unique<Transaction>(session().db());
-  std::vector<Arg> args{ref(vPieceIdent_), val(fournisseurIdent_), Arg(stagedValeur("DATE_CREATION")),
-                        ref(vDepotIdent_), val("EUR")};
+  std::vector<Arg> args{ref(vPieceIdent_), val(fournisseurIdent_),
+                        Arg(stagedValeur("DATE_CREATION")), ref(vDepotIdent_), val("EUR")};
   if (kind_.avoirs) {
     args.push_back(val(-1));
     args.push_back(val(saisieAna_ == 1 ? staged("AFFAIRE") : std::string()));
@@ -324,7 +328,8 @@ void QUARVOImport_generer::maj_ligne(Evt*) {
   }
   if (vCreerAflbud_.entier() == 1) {
     Field& ident = chaine("V_AFLBUD_IDENT");
-    EvtParamRef attribue{val("VOVOVA"), val("NUMEROS"), val("AFLBUD"), val(""), val(10), ref(ident)};
+    EvtParamRef attribue{val("VOVOVA"), val("NUMEROS"), val("AFLBUD"),
+                         val(""),       val(10),        ref(ident)};
     if (!appeler("ZUMNDOC", "ATTRIBUE_NUMERO", attribue)) return;
     EvtParamRef valide{val("VOVOVA"), val("NUMEROS"), val("AFLBUD"), val(""), val(10), ref(ident)};
     if (!appeler("ZUMNDOC", "VALIDE_NUMERO", valide)) return;
@@ -374,7 +379,8 @@ void QUARVOImport_generer::maj_ligne(Evt*) {
   std::string cle = frame::cleCompo(ligneIdent, kind_.entete, staged("NUMERO_DOC"));
   if (quarvo_.chercher(3, "CLE_COMPO", '=', Valeur::chaine(cle)) != 0) {
     Field& ident = chaine("V_QUARVO_IDENT");
-    EvtParamRef attribue{val("VOVOVA"), val("NUMEROS"), val("QUARVO"), val(""), val(10), ref(ident)};
+    EvtParamRef attribue{val("VOVOVA"), val("NUMEROS"), val("QUARVO"),
+                         val(""),       val(10),        ref(ident)};
     if (!appeler("ZUMNDOC", "ATTRIBUE_NUMERO", attribue)) return;
     EvtParamRef valide{val("VOVOVA"), val("NUMEROS"), val("QUARVO"), val(""), val(10), ref(ident)};
     if (!appeler("ZUMNDOC", "VALIDE_NUMERO", valide)) return;
@@ -391,7 +397,8 @@ void QUARVOImport_generer::maj_ligne(Evt*) {
     quarvo_.ecrire("DATE_MAJ", dateMaj_);
     quarvo_.ecrire("HEURE_MAJ", heureMaj_);
     quarvo_.ecrire("CLE_COMPO", Valeur::chaine(cle));
-    quarvo_.ecrire("CLE_COMPO2", Valeur::chaine(frame::cleCompo2(kind_.entete, vPieceIdent_.text())));
+    quarvo_.ecrire("CLE_COMPO2",
+                   Valeur::chaine(frame::cleCompo2(kind_.entete, vPieceIdent_.text())));
     quarvo_.inserer();
   }
   quarvo_.ecrire("QTE", Valeur::dbl(toDouble(quarvo_.valeur("QTE")) + vQte_.dbl()));
@@ -449,7 +456,8 @@ std::string QUARVOImport_generer::demandeur(const std::string& code) {
     serviceTexte = Table(this, "VOVOVA", "I_AFSERV", "").valeur("DESIG").toChaine();
   }
   Field& ident = chaine("V_GAPAPPOR_IDENT");
-  EvtParamRef attribue{val("GESCOM"), val("NUMEROS"), val("GAPAPPOR"), val(""), val(10), ref(ident)};
+  EvtParamRef attribue{val("GESCOM"), val("NUMEROS"), val("GAPAPPOR"),
+                       val(""),       val(10),        ref(ident)};
   if (!appeler("ZUMNDOC", "ATTRIBUE_NUMERO", attribue)) return "";
   EvtParamRef valide{val("GESCOM"), val("NUMEROS"), val("GAPAPPOR"), val(""), val(10), ref(ident)};
   if (!appeler("ZUMNDOC", "VALIDE_NUMERO", valide)) return "";
@@ -499,9 +507,12 @@ void QUARVOImport_generer::fin1(Evt*) {
   completerEntete();
   if (pieces_.modifier() != 0) return abandonnerPiece();
   if (kind_.echeances) {
-    EvtParamVal echeance{pieces_.valeur("IDENT"),         pieces_.valeur("NUMERO_DOC"),
-                         pieces_.valeur("GCPFOUR_IDENT"), pieces_.valeur("GCPREG_IDENT"),
-                         pieces_.valeur("DATE_CREATION"), pieces_.valeur("NET_A_PAYER"),
+    EvtParamVal echeance{pieces_.valeur("IDENT"),
+                         pieces_.valeur("NUMERO_DOC"),
+                         pieces_.valeur("GCPFOUR_IDENT"),
+                         pieces_.valeur("GCPREG_IDENT"),
+                         pieces_.valeur("DATE_CREATION"),
+                         pieces_.valeur("NET_A_PAYER"),
                          val(1)};
     appeler("GAPECH", "CREER_DEFAUT", echeance);
   }
@@ -534,6 +545,7 @@ void QUARVOImport_generer::message_erreur(Evt* evt) {
 void QUARVOImport_generer::sortie(Evt* evt) {
   sortieFaite();
   piece_.reset();  // a piece left open by a fault is not kept half-written
+  if (lot_) lot_->terminer();
   EvtParamVal none;
   // The bracket is closed only when it was opened: an empty file opens none.
   if (generationOuverte_) protocole("FIN_GENERATION", none);

@@ -13,9 +13,11 @@
 // movements.
 //
 // Each new piece is one transaction: its header, lines, budget booking, link rows, due dates
-// and settling are written whole or not at all. A piece whose number exists is skipped (only
-// settled when asked), so running a file again, or after a run was cut short, creates nothing
-// twice. A failed call of the purchasing module shows its text, sets the caller's error flag
+// and settling are written whole or not at all. Pieces are committed by groups (a piece is a
+// savepoint of its group), so that a large file does not pay one commit per piece. A piece whose
+// number exists is skipped (only settled when asked), so running a file again, or after a run was
+// cut short, creates nothing twice. A failed call of the purchasing module shows its text, sets the
+// caller's error flag
 // ("P_ERREUR", parameter 0 by reference) and abandons that piece; the run goes on.
 //
 // The four members are one implementation; `DifferencesGeneration` holds what tells them apart.
@@ -34,32 +36,68 @@ struct DifferencesGeneration {
   enum class Montants { Aucun, Engage, Realise };
   enum class Solde { Toujours, SaufSoldee, Jamais };
 
-  const char* code;       // "DF", "CF", "BF", "FF"
-  const char* staging;    // staging table
-  const char* entete;     // piece header table, also the piece module and the link component
-  bool moisSociete;       // the company's current month is read (V_ANMO)
-  bool avoirs;            // staged "TYPE" 'A' makes a credit note, booked negatively
-  bool majLigne;          // lines are booked on the budget ("MAJ_LIGNE")
-  Montants montants;      // what the booking changes on the budget line
-  bool resultats;         // orders: a results row and "AFRESU" "MAJ_AFRESU" per line
-  bool calculRaf;         // invoices: "AFRESU" "CALCUL_RAF_D" per line
-  bool numeroEntete;      // invoices: the supplier's number goes to the header's "NUMERO"
-  bool echeances;         // invoices: due dates and project movements
-  Solde solde;            // settling when the staged "SOLDE" is 1
+  const char* code;     // "DF", "CF", "BF", "FF"
+  const char* staging;  // staging table
+  const char* entete;   // piece header table, also the piece module and the link component
+  bool moisSociete;     // the company's current month is read (V_ANMO)
+  bool avoirs;          // staged "TYPE" 'A' makes a credit note, booked negatively
+  bool majLigne;        // lines are booked on the budget ("MAJ_LIGNE")
+  Montants montants;    // what the booking changes on the budget line
+  bool resultats;       // orders: a results row and "AFRESU" "MAJ_AFRESU" per line
+  bool calculRaf;       // invoices: "AFRESU" "CALCUL_RAF_D" per line
+  bool numeroEntete;    // invoices: the supplier's number goes to the header's "NUMERO"
+  bool echeances;       // invoices: due dates and project movements
+  Solde solde;          // settling when the staged "SOLDE" is 1
 };
 
-inline constexpr DifferencesGeneration kGenerationDf{
-    "DF",  "IMM_PIECE_DF", "GAPEDEV", false, false, false, DifferencesGeneration::Montants::Aucun,
-    false, false,          false,     false, DifferencesGeneration::Solde::Toujours};
-inline constexpr DifferencesGeneration kGenerationCf{
-    "CF",  "IMM_PIECE_CF", "GAPECOM", true,  false, true, DifferencesGeneration::Montants::Engage,
-    true,  false,          false,     false, DifferencesGeneration::Solde::SaufSoldee};
-inline constexpr DifferencesGeneration kGenerationBf{
-    "BF",  "IMM_PIECE_BF", "GAPEBL", true,  false, true, DifferencesGeneration::Montants::Aucun,
-    false, false,          false,    false, DifferencesGeneration::Solde::SaufSoldee};
-inline constexpr DifferencesGeneration kGenerationFf{
-    "FF", "IMM_PIECE_FF", "GAPEFAC", true, true, true, DifferencesGeneration::Montants::Realise,
-    false, true,          true,      true, DifferencesGeneration::Solde::Jamais};
+inline constexpr DifferencesGeneration kGenerationDf{"DF",
+                                                     "IMM_PIECE_DF",
+                                                     "GAPEDEV",
+                                                     false,
+                                                     false,
+                                                     false,
+                                                     DifferencesGeneration::Montants::Aucun,
+                                                     false,
+                                                     false,
+                                                     false,
+                                                     false,
+                                                     DifferencesGeneration::Solde::Toujours};
+inline constexpr DifferencesGeneration kGenerationCf{"CF",
+                                                     "IMM_PIECE_CF",
+                                                     "GAPECOM",
+                                                     true,
+                                                     false,
+                                                     true,
+                                                     DifferencesGeneration::Montants::Engage,
+                                                     true,
+                                                     false,
+                                                     false,
+                                                     false,
+                                                     DifferencesGeneration::Solde::SaufSoldee};
+inline constexpr DifferencesGeneration kGenerationBf{"BF",
+                                                     "IMM_PIECE_BF",
+                                                     "GAPEBL",
+                                                     true,
+                                                     false,
+                                                     true,
+                                                     DifferencesGeneration::Montants::Aucun,
+                                                     false,
+                                                     false,
+                                                     false,
+                                                     false,
+                                                     DifferencesGeneration::Solde::SaufSoldee};
+inline constexpr DifferencesGeneration kGenerationFf{"FF",
+                                                     "IMM_PIECE_FF",
+                                                     "GAPEFAC",
+                                                     true,
+                                                     true,
+                                                     true,
+                                                     DifferencesGeneration::Montants::Realise,
+                                                     false,
+                                                     true,
+                                                     true,
+                                                     true,
+                                                     DifferencesGeneration::Solde::Jamais};
 
 class QUARVOImport_generer : public host::Parcours {
  public:
@@ -78,8 +116,7 @@ class QUARVOImport_generer : public host::Parcours {
   // A call of the piece module's generation protocol; on failure runs "MESSAGE_ERREUR".
   bool protocole(const char* label, host::Evt& evt);
   // A call of another module's interface; returns true on success.
-  bool appeler(const char* module, const char* label, host::Evt& evt,
-               const char* instance = "*");
+  bool appeler(const char* module, const char* label, host::Evt& evt, const char* instance = "*");
   // Columns of the staged row last read (the traversal has moved on when "FIN1" runs).
   std::string staged(const char* column);
   host::Valeur stagedValeur(const char* column);
@@ -126,8 +163,9 @@ class QUARVOImport_generer : public host::Parcours {
   host::Table iAfaffa_;
   host::Table iAfpres_;
 
-  std::unique_ptr<host::Transaction> piece_;  // the piece being written
-  host::Row ligne_;                           // the staged row last read, as it was
+  std::unique_ptr<host::TransactionsGroupees> lot_;  // pieces committed by groups
+  std::unique_ptr<host::Transaction> piece_;         // the piece being written
+  host::Row ligne_;                                  // the staged row last read, as it was
   bool generationOuverte_ = false;
   bool boiteOuverte_ = false;
   std::string fournisseurIdent_;

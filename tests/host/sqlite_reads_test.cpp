@@ -1,0 +1,129 @@
+// What the SQLite database remembers of its reads, the columns an update writes, and grouped
+// transactions: every read must still give what the file holds, whoever changed it.
+#include <gtest/gtest.h>
+
+#include "host/table/Table.h"
+#include "support/TestSession.h"
+
+namespace quarvo::host {
+namespace {
+
+class SqliteReadsTest : public ::testing::Test {
+ protected:
+  void SetUp() override {
+    t_.sql(R"(CREATE TABLE "T_TEST" ("IDENT" TEXT NOT NULL PRIMARY KEY, "NOM" TEXT,
+               "N" INTEGER DEFAULT 0, "M" DECIMAL_TEXT);
+              INSERT INTO "T_TEST" VALUES ('01', 'a', 1, '1.00'), ('02', 'b', 2, '2.00');)");
+  }
+  // The identifiers and N of the rows named `nom`, read through a cursor.
+  std::string parNom(const char* nom) {
+    Table c(nullptr, "VOVOVA", "T_TEST", "LECTURE");
+    c.effacerCriteres();
+    c.ajouterCritere("NOM", '=', Valeur::chaine(nom));
+    c.ouvrir();
+    std::string out;
+    while (c.lire(1) == 0) {
+      out += c.valeur("IDENT").toChaine() + ":" + c.valeur("N").toChaine() + ";";
+    }
+    return out;
+  }
+  // Another connection to the same file, as another process would have.
+  std::unique_ptr<SqliteDatabase> autre() {
+    return std::make_unique<SqliteDatabase>(t_.dir() / "test.db", false);
+  }
+  test::TestSession t_;
+};
+
+TEST_F(SqliteReadsTest, ReadsInATransactionFollowOwnWritesRollbacksAndOtherConnections) {
+  Table w(nullptr, "VOVOVA", "T_TEST", "ECRITURE");
+  {
+    Transaction tx(t_.db());
+    EXPECT_EQ(parNom("a"), "01:1;");
+    ASSERT_EQ(w.chercher(3, "IDENT", '=', Valeur::chaine("01")), 0);
+    w.ecrire("N", Valeur::entier(10));  // not a selected column: the selection stays
+    ASSERT_EQ(w.modifier(), 0);
+    EXPECT_EQ(parNom("a"), "01:10;");
+    w.ecrire("NOM", Valeur::chaine("b"));  // now it moves to the other selection
+    ASSERT_EQ(w.modifier(), 0);
+    EXPECT_EQ(parNom("a"), "");
+    EXPECT_EQ(parNom("b"), "01:10;02:2;");
+    w.preparer();
+    w.ecrire("IDENT", Valeur::chaine("03"));
+    w.ecrire("NOM", Valeur::chaine("a"));
+    ASSERT_EQ(w.inserer(), 0);
+    EXPECT_EQ(parNom("a"), "03:0;");
+    ASSERT_EQ(w.supprimer('N'), 0);
+    EXPECT_EQ(parNom("a"), "");
+    tx.commit();
+  }
+  {
+    Transaction tx(t_.db());
+    EXPECT_EQ(parNom("b"), "01:10;02:2;");
+    ASSERT_EQ(w.chercher(3, "IDENT", '=', Valeur::chaine("02")), 0);
+    w.ecrire("N", Valeur::entier(20));
+    ASSERT_EQ(w.modifier(), 0);
+    EXPECT_EQ(parNom("b"), "01:10;02:20;");
+  }  // rolled back
+  {
+    Transaction tx(t_.db());
+    EXPECT_EQ(parNom("b"), "01:10;02:2;");
+    tx.commit();
+  }
+  autre()->execScript(R"(UPDATE "T_TEST" SET "N" = 5, "NOM" = 'c' WHERE "IDENT" = '02')");
+  {
+    Transaction tx(t_.db());
+    EXPECT_EQ(parNom("b"), "01:10;");
+    EXPECT_EQ(parNom("c"), "02:5;");
+    tx.commit();
+  }
+  EXPECT_EQ(parNom("c"), "02:5;");  // outside a transaction too
+}
+
+TEST_F(SqliteReadsTest, AnUpdateWritesOnlyTheColumnsItChanged) {
+  Table w(nullptr, "VOVOVA", "T_TEST", "ECRITURE");
+  ASSERT_EQ(w.chercher(3, "IDENT", '=', Valeur::chaine("01")), 0);
+  // Someone else changes M after our read; we change N only: both changes stay.
+  autre()->execScript(R"(UPDATE "T_TEST" SET "M" = '7.50' WHERE "IDENT" = '01')");
+  w.ecrire("N", Valeur::entier(3));
+  ASSERT_EQ(w.modifier(), 0);
+  ASSERT_EQ(w.modifier(), 0);  // nothing changed since: nothing written
+  EXPECT_EQ(t_.value("T_TEST", "M", "IDENT", "01"), "7.50");
+  EXPECT_EQ(t_.value("T_TEST", "N", "IDENT", "01"), "3");
+}
+
+TEST_F(SqliteReadsTest, GroupedUnitsAreWholeOrAbsentAndCommittedByGroups) {
+  auto lecteur = autre();
+  auto compter = [&] { return lecteur->store("T_TEST")->count({}); };
+  auto unite = [&](const char* ident, bool garder) {
+    Transaction tx(t_.db());
+    Table w(nullptr, "VOVOVA", "T_TEST", "ECRITURE");
+    w.preparer();
+    w.ecrire("IDENT", Valeur::chaine(ident));
+    ASSERT_EQ(w.inserer(), 0);
+    if (garder) tx.commit();
+  };
+  {
+    TransactionsGroupees groupe(t_.db(), 2, std::chrono::hours(1));
+    unite("10", true);
+    groupe.uniteTerminee();
+    unite("11", false);  // abandoned: leaves nothing
+    groupe.uniteTerminee();
+    EXPECT_EQ(compter(), 3);  // the first group is committed
+    unite("12", true);
+    groupe.uniteTerminee();
+    EXPECT_EQ(compter(), 3);  // still in the open group
+    groupe.terminer();
+    EXPECT_EQ(compter(), 4);
+    groupe.terminer();
+  }
+  {
+    TransactionsGroupees groupe(t_.db(), 100);
+    unite("13", true);
+    groupe.uniteTerminee();
+  }  // cut short: the open group is rolled back, as a crash would
+  EXPECT_EQ(compter(), 4);
+  EXPECT_EQ(t_.db().depth(), 0);
+}
+
+}  // namespace
+}  // namespace quarvo::host
