@@ -70,10 +70,10 @@ void ajouterUtf8(std::string& out, uint32_t cp) {
 }
 
 // Code points of Windows-1252 bytes 0x80..0x9F (0xFFFD where the code page has none).
-constexpr uint32_t kCp1252[32] = {
-    0x20AC, 0xFFFD, 0x201A, 0x0192, 0x201E, 0x2026, 0x2020, 0x2021, 0x02C6, 0x2030, 0x0160,
-    0x2039, 0x0152, 0xFFFD, 0x017D, 0xFFFD, 0xFFFD, 0x2018, 0x2019, 0x201C, 0x201D, 0x2022,
-    0x2013, 0x2014, 0x02DC, 0x2122, 0x0161, 0x203A, 0x0153, 0xFFFD, 0x017E, 0x0178};
+constexpr uint32_t kCp1252[32] = {0x20AC, 0xFFFD, 0x201A, 0x0192, 0x201E, 0x2026, 0x2020, 0x2021,
+                                  0x02C6, 0x2030, 0x0160, 0x2039, 0x0152, 0xFFFD, 0x017D, 0xFFFD,
+                                  0xFFFD, 0x2018, 0x2019, 0x201C, 0x201D, 0x2022, 0x2013, 0x2014,
+                                  0x02DC, 0x2122, 0x0161, 0x203A, 0x0153, 0xFFFD, 0x017E, 0x0178};
 
 }  // namespace
 
@@ -307,8 +307,8 @@ ResultatChargement ImportTexte::charger(Session& session, const std::string& tab
     colonnes.push_back(*i);
   }
   if (r.erreurs.empty() && colPiece == SIZE_MAX) {
-    r.erreurs.push_back({1, "NUMERO_DOC", "",
-                         "colonne absente : la première ligne doit nommer les colonnes", ""});
+    r.erreurs.push_back(
+        {1, "NUMERO_DOC", "", "colonne absente : la première ligne doit nommer les colonnes", ""});
   }
   if (!r.erreurs.empty()) {
     ecrireErreurs(session, table, fichier, r.erreurs);
@@ -348,6 +348,9 @@ ResultatChargement ImportTexte::charger(Session& session, const std::string& tab
         }
       }
       staging.ecrire("LIGNE_FICHIER", Valeur::entier(static_cast<int64_t>(no)));
+      // Numbered here in file order (the table was just emptied), rather than by the table's
+      // trigger, which would write every row a second time.
+      staging.ecrire("IDENT", Valeur::chaine(dixChiffres(lignes + 1)));
       if (saine && r.erreurs.empty()) {
         if (staging.inserer() != 0) {
           noter({no, "", "", "ligne refusée par la base de données", piece});

@@ -8,7 +8,10 @@
 
 namespace quarvo::host {
 
-Automate::Automate(Evt*) : session_(Session::current()) {}
+Automate::Automate(Evt*) : session_(Session::current()) {
+  // Room for the branches of most automata, so that declaring them never moves the list.
+  branches_.reserve(32);
+}
 
 Automate::~Automate() = default;
 
@@ -57,7 +60,7 @@ Table* Automate::tableParContexte(const std::string& contextOrName) const {
 void Automate::addBranch(const std::string& label, Handler handler) {
   auto open = label.find('(');
   if (open == std::string::npos || label.back() != ')') {
-    branches_[label] = Branch{std::move(handler), 0, label};
+    branches_.push_back(Branch{label, std::move(handler), 0, {}});
     return;
   }
   // "TRANSFORMER(3,4)": one handler reached by "TRANSFORMER3" and "TRANSFORMER4".
@@ -66,11 +69,11 @@ void Automate::addBranch(const std::string& label, Handler handler) {
   size_t start = 0;
   while (start <= list.size()) {
     size_t comma = list.find(',', start);
-    std::string item = list.substr(start, comma == std::string::npos ? std::string::npos
-                                                                     : comma - start);
+    std::string item =
+        list.substr(start, comma == std::string::npos ? std::string::npos : comma - start);
     int n = 0;
     std::from_chars(item.data(), item.data() + item.size(), n);
-    branches_[stem + std::to_string(n)] = Branch{handler, n, label};
+    branches_.push_back(Branch{stem + std::to_string(n), handler, n, label});
     if (comma == std::string::npos) break;
     start = comma + 1;
   }
@@ -85,22 +88,35 @@ void Automate::lierParametres(Evt* evt, std::initializer_list<std::pair<Field*, 
   }
 }
 
-bool Automate::hasBranch(const std::string& label) const { return branches_.count(label) > 0; }
+const Automate::Branch* Automate::branche(const std::string& label) const {
+  for (auto it = branches_.rbegin(); it != branches_.rend(); ++it) {
+    if (it->label == label) return &*it;
+  }
+  return nullptr;
+}
+
+bool Automate::hasBranch(const std::string& label) const {
+  return branche(label) != nullptr;
+}
 
 bool Automate::raise(const std::string& label, Evt* evt) {
-  auto it = branches_.find(label);
-  if (it == branches_.end()) return false;
-  Branch& branch = it->second;
-  numero_ = branch.numero;
+  const Branch* found = branche(label);
+  if (found == nullptr) return false;
+  // The handler runs from a copy and the branch is found again by position: a handler may
+  // declare branches, which moves the list.
+  auto position = static_cast<size_t>(found - branches_.data());
+  Handler handler = found->handler;
+  numero_ = found->numero;
   if (evt != nullptr) {
-    evt->setNumero(branch.numero);
+    evt->setNumero(found->numero);
     evt->setErreur(0);
   }
   rejected_ = false;
   try {
-    branch.handler(evt);
+    handler(evt);
   } catch (UException& e) {
-    e.setLabel(branch.declared);
+    const Branch& branch = branches_[position];
+    e.setLabel(branch.declared.empty() ? branch.label : branch.declared);
     if (evt != nullptr) {
       evt->adresseC(&e);
       exception(evt);
@@ -128,17 +144,21 @@ void Automate::erreurMethode(int flag, Evt* evt) {
   if (evt != nullptr) evt->setErreur(flag);
 }
 
-void Automate::sortir(Evt*, int) { ended_ = true; }
+void Automate::sortir(Evt*, int) {
+  ended_ = true;
+}
 
 void Automate::rejeter(Evt* evt) {
   rejected_ = true;
   if (evt != nullptr) evt->setErreur(1);
 }
 
-void Automate::controler(const std::string& control) { ecran().focus(control); }
+void Automate::controler(const std::string& control) {
+  ecran().focus(control);
+}
 
-void Automate::appelerProcedure(const std::string&, const std::string& module,
-                                const std::string&, const std::string& label, Evt* evt, int) {
+void Automate::appelerProcedure(const std::string&, const std::string& module, const std::string&,
+                                const std::string& label, Evt* evt, int) {
   if (module.empty()) {
     EvtParamVal none;
     Evt* e = evt != nullptr ? evt : &none;
@@ -203,10 +223,18 @@ Ecran& Automate::ecran() {
   if (!ecran_) ecran_ = std::make_unique<Ecran>();
   return *ecran_;
 }
-void Automate::autoriser(const std::string& c) { ecran().controle(c).actif = true; }
-void Automate::interdire(const std::string& c) { ecran().controle(c).actif = false; }
-void Automate::cacher(const std::string& c) { ecran().controle(c).visible = false; }
-void Automate::rendreVisible(const std::string& c) { ecran().controle(c).visible = true; }
+void Automate::autoriser(const std::string& c) {
+  ecran().controle(c).actif = true;
+}
+void Automate::interdire(const std::string& c) {
+  ecran().controle(c).actif = false;
+}
+void Automate::cacher(const std::string& c) {
+  ecran().controle(c).visible = false;
+}
+void Automate::rendreVisible(const std::string& c) {
+  ecran().controle(c).visible = true;
+}
 
 void Automate::executer(Evt* evt) {
   for (const char* label : {"INIT", "DEBUT", "FAIRE"}) {

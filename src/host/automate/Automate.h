@@ -90,18 +90,16 @@ class Automate {
   // Calls. With an empty module: a label of this automaton, now. With a module name: a label of
   // that module's "INTERFACE" automaton. The outcome is read with erreurMethode() afterwards.
   void appelerProcedure(const std::string& instance, const std::string& module,
-                        const std::string& automaton, const std::string& label, Evt* evt,
-                        int flag);
+                        const std::string& automaton, const std::string& label, Evt* evt, int flag);
   // The same, queued on the session's event loop (parameters are copied by value).
   void lancerProcedure(const std::string& instance, const std::string& module,
-                       const std::string& automaton, const std::string& label, Evt* evt,
-                       int flag);
+                       const std::string& automaton, const std::string& label, Evt* evt, int flag);
   // Creates automaton `name` and runs it to its end before returning.
   void appelerModule(const std::string& instance, const std::string& module,
                      const std::string& name, Evt* evt);
   // Opens automaton `name` on its own, on the session's event loop.
-  void lancerModule(const std::string& instance, const std::string& module,
-                    const std::string& name, Evt* evt);
+  void lancerModule(const std::string& instance, const std::string& module, const std::string& name,
+                    Evt* evt);
 
   // Dialogs: returns the button chosen (1-based).
   int BoiteDialogue(const std::string& title, const std::string& text, int icon,
@@ -142,9 +140,10 @@ class Automate {
 
  protected:
   struct Branch {
+    std::string label;  // the label raised ("TRANSFORMER3")
     Handler handler;
     int numero = 0;
-    std::string declared;  // the label as declared ("TRANSFORMER(3,4)")
+    std::string declared;  // the label as declared ("TRANSFORMER(3,4)"); empty when the same
   };
 
  private:
@@ -157,7 +156,11 @@ class Automate {
   std::vector<std::unique_ptr<Field>> fields_;
   std::map<std::string, Field*> fieldIndex_;
   std::vector<Table*> tables_;
-  std::map<std::string, Branch> branches_;
+  // In order of declaration; a label declared again (by a derived class) replaces the earlier
+  // one, so lookups go from the end. An automaton is made for one or two raises, most often:
+  // a plain list is cheaper to build than a tree.
+  std::vector<Branch> branches_;
+  const Branch* branche(const std::string& label) const;
   std::unique_ptr<Ecran> ecran_;
   int numero_ = 0;
   int outcome_ = 0;

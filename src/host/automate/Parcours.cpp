@@ -33,23 +33,32 @@ void Parcours::executer(Evt* evt) {
     Table& t = courant();
     t.effacerCriteres();
     for (const auto& c : criteria_) t.ajouterCritere(c.column, c.op, c.value);
-    t.ouvrir();
-    // The selection comes in key order; the sort plan orders it (stable: ties keep key order).
-    std::vector<std::pair<std::vector<Valeur>, RowId>> order;
-    while (t.lire(1) == 0) {
-      std::vector<Valeur> key;
-      for (const auto& col : sort_) key.push_back(t.valeur(col));
-      order.emplace_back(std::move(key), t.courantId());
-    }
-    std::stable_sort(order.begin(), order.end(), [](const auto& a, const auto& b) {
-      for (size_t i = 0; i < a.first.size(); ++i) {
-        int c = Valeur::compare(a.first[i], b.first[i]);
-        if (c != 0) return c < 0;
+    // The selection in the sort plan's order, ties in key order: the store orders it when it
+    // can, else it comes in key order and is sorted here (stable).
+    std::vector<RowId> order;
+    if (sort_.empty() || t.ouvrirTrie(sort_)) {
+      if (sort_.empty()) t.ouvrir();
+      order.reserve(t.tailleSelection());
+      for (size_t i = 0; i < t.tailleSelection(); ++i) order.push_back(t.selectionnee(i));
+    } else {
+      t.ouvrir();
+      std::vector<std::pair<std::vector<Valeur>, RowId>> keyed;
+      while (t.lire(1) == 0) {
+        std::vector<Valeur> key;
+        for (const auto& col : sort_) key.push_back(t.valeur(col));
+        keyed.emplace_back(std::move(key), t.courantId());
       }
-      return false;
-    });
+      std::stable_sort(keyed.begin(), keyed.end(), [](const auto& a, const auto& b) {
+        for (size_t i = 0; i < a.first.size(); ++i) {
+          int c = Valeur::compare(a.first[i], b.first[i]);
+          if (c != 0) return c < 0;
+        }
+        return false;
+      });
+      for (const auto& k : keyed) order.push_back(k.second);
+    }
     std::optional<Valeur> group;
-    for (const auto& [key, id] : order) {
+    for (RowId id : order) {
       if (termine() || stop_) break;
       if (t.aller(id) != 0) continue;  // deleted since the selection was made
       Valeur breakValue = break_.empty() ? Valeur() : t.valeur(break_);

@@ -7,8 +7,12 @@
 
 namespace quarvo::host {
 
-void* UniqueAlloc(size_t size) noexcept { return ::operator new(size, std::nothrow); }
-void UniqueFree(void* storage) noexcept { ::operator delete(storage); }
+void* UniqueAlloc(size_t size) noexcept {
+  return ::operator new(size, std::nothrow);
+}
+void UniqueFree(void* storage) noexcept {
+  ::operator delete(storage);
+}
 
 void AutomateDeleter::operator()(Automate* a) const noexcept {
   if (a == nullptr) return;
@@ -22,10 +26,16 @@ Registry& Registry::instance() {
 }
 
 Fabrique Registry::find(const std::string& name) const {
+  // Every call of another module's interface looks its factory up: by hash, not by scan.
+  auto it = factories_.find(name);
+  return it != factories_.end() ? it->second : nullptr;
+}
+
+void Registry::indexer() {
+  factories_.clear();
   for (const auto& item : items_) {
-    if (item.factory != nullptr && item.entry.first == name) return item.factory;
+    if (item.factory != nullptr) factories_.try_emplace(item.entry.first, item.factory);
   }
-  return nullptr;
 }
 
 std::vector<std::string> Registry::names() const {
@@ -46,6 +56,7 @@ Field* Registry::global(const std::string& name) const {
 void Registry::add(RecordEntry entry, Fabrique factory, std::unique_ptr<Field> global) {
   records_.push_back(entry);
   items_.push_back({std::move(entry), factory, std::move(global)});
+  indexer();
 }
 
 void Registry::remove(const RecordEntry& entry) {
@@ -64,35 +75,46 @@ void Registry::remove(const RecordEntry& entry) {
       break;
     }
   }
+  indexer();
 }
 
-static std::string text(const char* s) { return s ? s : ""; }
+static std::string text(const char* s) {
+  return s ? s : "";
+}
 
-VariableGlobale::VariableGlobale(const char* name, const char* label, const char* third,
-                                 int access, const char* initial)
+VariableGlobale::VariableGlobale(const char* name, const char* label, const char* third, int access,
+                                 const char* initial)
     : entry_{"Variable", text(name), text(initial)} {
-  Registry::instance().add(entry_, nullptr,
-                           std::make_unique<Field>(text(name), text(label), text(third), access,
-                                                   Kind::Chaine, Valeur::chaine(text(initial)),
-                                                   nullptr));
+  Registry::instance().add(
+      entry_, nullptr,
+      std::make_unique<Field>(text(name), text(label), text(third), access, Kind::Chaine,
+                              Valeur::chaine(text(initial)), nullptr));
 }
-VariableGlobale::~VariableGlobale() { Registry::instance().remove(entry_); }
+VariableGlobale::~VariableGlobale() {
+  Registry::instance().remove(entry_);
+}
 
 Global::Global(const char* provider, const char* module)
     : entry_{"Global", text(provider), text(module)} {
   Registry::instance().add(entry_);
 }
-Global::~Global() { Registry::instance().remove(entry_); }
+Global::~Global() {
+  Registry::instance().remove(entry_);
+}
 
 Module::Module(const char*, const char* name, Fabrique factory, bool, const char*)
     : entry_{"Module", text(name), ""} {
   Registry::instance().add(entry_, factory);
 }
-Module::~Module() { Registry::instance().remove(entry_); }
+Module::~Module() {
+  Registry::instance().remove(entry_);
+}
 
 Source::Source(const char* key, const char*) : entry_{"Source", text(key), ""} {
   Registry::instance().add(entry_);
 }
-Source::~Source() { Registry::instance().remove(entry_); }
+Source::~Source() {
+  Registry::instance().remove(entry_);
+}
 
 }  // namespace quarvo::host

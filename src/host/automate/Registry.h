@@ -13,6 +13,7 @@
 
 #include <memory>
 #include <string>
+#include <unordered_map>
 #include <vector>
 
 #include "host/field/Field.h"
@@ -69,8 +70,12 @@ class Registry {
     Fabrique factory;
     std::unique_ptr<Field> global;
   };
+  // Rebuilds the by-name index of factories (the first registration of a name wins).
+  void indexer();
+
   std::vector<Item> items_;
   std::vector<RecordEntry> records_;
+  std::unordered_map<std::string, Fabrique> factories_;
 };
 
 // A runtime global value declared by a module (found by name by the runtime).

@@ -100,9 +100,42 @@ class SqliteStore : public TableStore {
     return ids;
   }
 
+  std::optional<std::vector<RowId>> selectTriee(const std::vector<Criterion>& criteria,
+                                                const std::vector<std::string>& tri) override {
+    // Texts compare bytewise in SQLite as in Valeur::compare; numbers, ISO dates and times
+    // order alike. Decimals are stored as text and lists are not ordered: those are sorted by
+    // the caller. A missing value reads as the kind's default, so it orders as one.
+    std::string ordre = " ORDER BY ";
+    for (const auto& column : tri) {
+      auto i = schema_.index(column);
+      if (!i) return std::nullopt;
+      const ColumnInfo& col = schema_.columns()[*i];
+      std::string q = sqlIdent(col.name);
+      switch (col.kind) {
+        case ColKind::Text:
+        case ColKind::Date:
+        case ColKind::Time:
+          ordre += "COALESCE(" + q + ", ''), ";
+          break;
+        case ColKind::Integer:
+        case ColKind::Real:
+          ordre += "COALESCE(" + q + ", 0), ";
+          break;
+        default:
+          return std::nullopt;
+      }
+    }
+    return lireSelection(criteria, ordre + order_.substr(std::string(" ORDER BY ").size()));
+  }
+
   std::vector<RowId> lireSelection(const std::vector<Criterion>& criteria) {
+    return lireSelection(criteria, order_);
+  }
+
+  std::vector<RowId> lireSelection(const std::vector<Criterion>& criteria,
+                                   const std::string& ordre) {
     std::vector<Valeur> binds;
-    std::string sql = "SELECT rowid FROM " + sqlIdent(name_) + where(criteria, binds) + order_;
+    std::string sql = "SELECT rowid FROM " + sqlIdent(name_) + where(criteria, binds) + ordre;
     sqlite3_stmt* st = db_.prepare(sql);
     Reset reset{st};
     bindAll(st, binds, 1);
@@ -349,10 +382,30 @@ class SqliteStore : public TableStore {
       bindValue(st, n, storageForm(col.kind, defaultOf(col.kind)));
       return;
     }
-    auto fitted = fitColumn(col, row.values[i]);
+    const Valeur& v = row.values[i];
+    if (v.kind() == valueKindOf(col.kind)) {
+      // Already of the column's kind (cursors write values fitted): bound without a copy.
+      switch (v.kind()) {
+        case Kind::Chaine: {
+          const std::string& text = v.asChaine();
+          sqlite3_bind_text(st, n, text.data(), static_cast<int>(text.size()), SQLITE_TRANSIENT);
+          return;
+        }
+        case Kind::Entier:
+          sqlite3_bind_int64(st, n, v.asEntier());
+          return;
+        case Kind::Double:
+          sqlite3_bind_double(st, n, v.asDouble());
+          return;
+        default:
+          bindValue(st, n, storageForm(col.kind, v));
+          return;
+      }
+    }
+    auto fitted = fitColumn(col, v);
     if (!fitted) {
-      throw UException("value '" + row.values[i].toChaine() + "' does not fit column " + name_ +
-                       "." + col.name);
+      throw UException("value '" + v.toChaine() + "' does not fit column " + name_ + "." +
+                       col.name);
     }
     bindValue(st, n, storageForm(col.kind, *fitted));
   }
@@ -401,15 +454,18 @@ namespace {
 // A piece written inside a group of pieces is a savepoint: the pages it changes are first copied
 // to the statement journal, which SQLite spills to a temporary file after 64 KiB. Keeping it in
 // memory saves a file write per page; it is emptied whenever no savepoint is open, so it holds
-// at most one piece's pages. Settings of this kind must be made before SQLite initialises.
-[[maybe_unused]] const bool journauxEnMemoire = [] {
+// at most one piece's pages. No memory statistics are kept: they cost a global lock per
+// allocation. Settings of this kind must be made before SQLite initialises.
+[[maybe_unused]] const bool reglagesSqlite = [] {
   sqlite3_config(SQLITE_CONFIG_STMTJRNL_SPILL, -1);
+  sqlite3_config(SQLITE_CONFIG_MEMSTATUS, 0);
   return true;
 }();
 }  // namespace
 
 SqliteDatabase::SqliteDatabase(const std::filesystem::path& path, bool create) : path_(path) {
-  int flags = SQLITE_OPEN_READWRITE | (create ? SQLITE_OPEN_CREATE : 0);
+  // A connection serves one session, on one thread: no locking of its own is needed.
+  int flags = SQLITE_OPEN_READWRITE | SQLITE_OPEN_NOMUTEX | (create ? SQLITE_OPEN_CREATE : 0);
   if (sqlite3_open_v2(path.c_str(), &db_, flags, nullptr) != SQLITE_OK) {
     std::string msg = db_ ? sqlite3_errmsg(db_) : "out of memory";
     sqlite3_close(db_);
@@ -472,6 +528,13 @@ std::vector<std::string> SqliteDatabase::tableNames() {
   return names;
 }
 
+void SqliteDatabase::pas(const std::string& sql) {
+  // Savepoints come and go with every unit of a batch: their statements are prepared once.
+  sqlite3_stmt* st = prepare(sql);
+  Reset reset{st};
+  if (sqlite3_step(st) != SQLITE_DONE) fail(sql);
+}
+
 void SqliteDatabase::oublierLectures() {
   for (auto& [name, store] : stores_) store->oublier();
 }
@@ -501,7 +564,7 @@ void SqliteDatabase::begin() {
     if (version != dataVersion_ || version < 0) oublierLectures();
     dataVersion_ = version;
   } else {
-    executer("SAVEPOINT sp" + std::to_string(depth_));
+    pas("SAVEPOINT sp" + std::to_string(depth_));
   }
   ++depth_;
 }
@@ -509,7 +572,11 @@ void SqliteDatabase::begin() {
 void SqliteDatabase::commit() {
   if (depth_ == 0) throw UException("commit without a transaction");
   --depth_;
-  executer(depth_ == 0 ? std::string("COMMIT") : "RELEASE sp" + std::to_string(depth_));
+  if (depth_ == 0) {
+    executer("COMMIT");
+  } else {
+    pas("RELEASE sp" + std::to_string(depth_));
+  }
 }
 
 void SqliteDatabase::rollback() {

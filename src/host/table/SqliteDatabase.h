@@ -4,7 +4,8 @@
 // INTEGER, REAL, DECIMAL_TEXT (exact decimal as canonical text), DATE_TEXT (ISO date, '' when
 // none), TIME_TEXT, DECIMAL_LIST_TEXT and DATE_LIST_TEXT (values joined by ';'). Every value is
 // bound as a parameter; identifiers are checked against the schema before they reach SQL text.
-// Several processes may share one file: writers wait for each other (busy timeout).
+// Several processes may share one file: writers wait for each other (busy timeout). A connection
+// belongs to one thread.
 //
 // Inside a transaction, small selections and the rows they give are remembered per table and
 // answered from memory when asked again: a batch looks up the same reference rows for every
@@ -55,6 +56,8 @@ class SqliteDatabase : public Database {
   std::filesystem::path path_;
   sqlite3* db_ = nullptr;
   void executer(const std::string& sql);
+  // Runs one cached statement that returns no rows.
+  void pas(const std::string& sql);
   void oublierLectures();
 
   int depth_ = 0;

@@ -67,6 +67,14 @@ class TableStore {
   virtual bool extensible() const = 0;
   // Row ids of the matching rows in the table's key order.
   virtual std::vector<RowId> select(const std::vector<Criterion>& criteria) = 0;
+  // The matching rows ordered on `tri` (then the key), when the store can order on those
+  // columns exactly as Valeur::compare would; nullopt when the caller must sort them itself.
+  virtual std::optional<std::vector<RowId>> selectTriee(const std::vector<Criterion>& criteria,
+                                                        const std::vector<std::string>& tri) {
+    (void)criteria;
+    (void)tri;
+    return std::nullopt;
+  }
   virtual bool fetch(RowId id, Row& out) = 0;
   virtual RowId insert(const Row& row) = 0;
   // Writes the columns flagged in `changees` (those the caller changed since it read the row);

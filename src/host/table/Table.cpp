@@ -51,6 +51,15 @@ int Table::ouvrir() {
   return selection_.empty() ? 1 : 0;
 }
 
+bool Table::ouvrirTrie(const std::vector<std::string>& tri) {
+  auto ids = store().selectTriee(criteria_, tri);
+  if (!ids) return false;
+  selection_ = std::move(*ids);
+  open_ = true;
+  position_ = 0;
+  return true;
+}
+
 void Table::load(RowId id) {
   current_ = id;
   changees_.clear();

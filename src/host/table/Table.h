@@ -42,6 +42,9 @@ class Table {
   void verrouiller(char mode = 'E') { lock_ = mode; }
   // Opens the selection; returns 0 when it holds at least one row.
   int ouvrir();
+  // Opens the selection ordered on `tri` (ties in key order) when the store can order it;
+  // false, and nothing opened, when it cannot.
+  bool ouvrirTrie(const std::vector<std::string>& tri);
   // mode 1 next row, 3 first row, 4 last row. Opens the selection when it is not open.
   int lire(int mode = 1, char option = 'A');
   // New selection on one criterion, then read with `mode`.
@@ -55,6 +58,8 @@ class Table {
   int64_t compter();
   // Number of rows in the open selection.
   size_t tailleSelection() const { return selection_.size(); }
+  // The row id at position i of the open selection. REQUIRES: i < tailleSelection().
+  RowId selectionnee(size_t i) const { return selection_[i]; }
 
   // The row id of the current row, and positioning on a row id of this table.
   RowId courantId() const { return current_; }
