@@ -79,6 +79,33 @@ TEST_F(SqliteReadsTest, ReadsInATransactionFollowOwnWritesRollbacksAndOtherConne
   EXPECT_EQ(parNom("c"), "02:5;");  // outside a transaction too
 }
 
+TEST_F(SqliteReadsTest, ColumnsKeptByATriggerAreReadAgainAfterTheUpdatesThatFireIt) {
+  t_.sql(R"(CREATE TABLE "T_CLE" ("IDENT" TEXT PRIMARY KEY, "NOM" TEXT, "N" INTEGER DEFAULT 0,
+                                   "CLE" TEXT);
+            CREATE TRIGGER "TR_T_CLE" AFTER UPDATE OF "NOM" ON "T_CLE"
+            BEGIN UPDATE "T_CLE" SET "CLE" = NEW."NOM" || '|' WHERE rowid = NEW.rowid; END;
+            INSERT INTO "T_CLE" VALUES ('01', 'a', 1, 'a|');)");
+  Table w(nullptr, "VOVOVA", "T_CLE", "ECRITURE");
+  auto parCle = [&](const char* cle) {
+    Table c(nullptr, "VOVOVA", "T_CLE", "LECTURE");
+    if (c.chercher(3, "CLE", '=', Valeur::chaine(cle)) != 0) return std::string("-");
+    return c.valeur("NOM").toChaine() + ":" + c.valeur("N").toChaine();
+  };
+  Transaction tx(t_.db());
+  EXPECT_EQ(parCle("a|"), "a:1");
+  ASSERT_EQ(w.chercher(3, "IDENT", '=', Valeur::chaine("01")), 0);
+  w.ecrire("N", Valeur::entier(2));  // fires nothing
+  ASSERT_EQ(w.modifier(), 0);
+  EXPECT_EQ(parCle("a|"), "a:2");
+  w.ecrire("NOM", Valeur::chaine("b"));  // the trigger rewrites CLE
+  ASSERT_EQ(w.modifier(), 0);
+  EXPECT_EQ(parCle("a|"), "-");
+  EXPECT_EQ(parCle("b|"), "b:2");
+  ASSERT_EQ(w.chercher(3, "IDENT", '=', Valeur::chaine("01")), 0);
+  EXPECT_EQ(w.valeur("CLE").toChaine(), "b|");
+  tx.commit();
+}
+
 TEST_F(SqliteReadsTest, AnUpdateWritesOnlyTheColumnsItChanged) {
   Table w(nullptr, "VOVOVA", "T_TEST", "ECRITURE");
   ASSERT_EQ(w.chercher(3, "IDENT", '=', Valeur::chaine("01")), 0);

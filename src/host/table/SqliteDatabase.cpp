@@ -3,6 +3,7 @@
 #include <sqlite3.h>
 
 #include <algorithm>
+#include <cctype>
 
 #include "host/UException.h"
 
@@ -69,12 +70,53 @@ class SqliteStore : public TableStore {
     fetchSql_ = "SELECT " + cols + " FROM " + sqlIdent(name_) + " WHERE rowid = ?";
     insertSql_ = "INSERT INTO " + sqlIdent(name_) + " (" + cols + ") VALUES (" + marks + ")";
     updateSql_ = "UPDATE " + sqlIdent(name_) + " SET " + sets + " WHERE rowid = ?";
+    colonnesCritere_.assign(schema_.columns().size(), false);
+    colonnesDeclencheur_.assign(schema_.columns().size(), false);
     sqlite3_stmt* tr =
-        db_.prepare("SELECT COUNT(*) FROM sqlite_master WHERE type = 'trigger' AND tbl_name = ?");
+        db_.prepare("SELECT sql FROM sqlite_master WHERE type = 'trigger' AND tbl_name = ?");
     Reset resetTr{tr};
     sqlite3_bind_text(tr, 1, name_.c_str(), -1, SQLITE_TRANSIENT);
-    declencheurs_ = sqlite3_step(tr) == SQLITE_ROW && sqlite3_column_int64(tr, 0) > 0;
-    colonnesCritere_.assign(schema_.columns().size(), false);
+    while (sqlite3_step(tr) == SQLITE_ROW) {
+      const unsigned char* sql = sqlite3_column_text(tr, 0);
+      noterDeclencheur(sql ? reinterpret_cast<const char*>(sql) : "");
+    }
+  }
+
+  // Notes which updates fire a trigger of the table: "UPDATE OF a, b" names its columns, a
+  // plain UPDATE trigger fires on any. Insert and delete triggers need nothing: inserts and
+  // deletes forget the table's selections anyway.
+  void noterDeclencheur(std::string sql) {
+    for (char& c : sql) c = static_cast<char>(std::toupper(static_cast<unsigned char>(c)));
+    for (char& c : sql) {
+      if (std::isspace(static_cast<unsigned char>(c))) c = ' ';
+    }
+    std::string entete = sql.substr(0, sql.find(" BEGIN"));  // the event clause
+    auto of = entete.find(" UPDATE OF ");
+    if (of == std::string::npos) {
+      if (entete.find(" UPDATE ") != std::string::npos) declencheTout_ = true;
+      return;
+    }
+    auto on = entete.find(" ON ", of);
+    std::string liste =
+        entete.substr(of + 11, on == std::string::npos ? std::string::npos : on - of - 11);
+    size_t debut = 0;
+    while (debut <= liste.size()) {
+      size_t virgule = liste.find(',', debut);
+      std::string nom =
+          liste.substr(debut, virgule == std::string::npos ? std::string::npos : virgule - debut);
+      std::string propre;
+      for (char c : nom) {
+        if (c != '"' && c != ' ' && c != '`' && c != '[' && c != ']') propre += c;
+      }
+      auto i = schema_.index(propre);
+      if (i) {
+        colonnesDeclencheur_[*i] = true;
+      } else {
+        declencheTout_ = true;  // not understood: assume the worst
+      }
+      if (virgule == std::string::npos) break;
+      debut = virgule + 1;
+    }
   }
 
   // Forgets every remembered selection and row.
@@ -195,14 +237,19 @@ class SqliteStore : public TableStore {
       if (changee(i)) ecrites.push_back(i);
     }
     if (ecrites.empty()) return;
+    bool declenche = declencheTout_;
+    for (size_t i : ecrites) declenche = declenche || colonnesDeclencheur_[i];
     auto retenue = lignes_.find(id);
-    // A remembered selection stays right when no column it selects on changes, which a trigger
-    // might do behind our back.
-    if (declencheurs_ || retenue == lignes_.end() || !retenue->second ||
+    // A remembered selection stays right when no column it selects on changes, and no trigger
+    // fires (it might change any column behind our back).
+    if (declenche || retenue == lignes_.end() || !retenue->second ||
         changeUnCritere(*retenue->second, row, ecrites)) {
       selections_.clear();
     }
-    if (retenue != lignes_.end()) retenue->second.reset();  // read again on its next fetch
+    // The remembered row is forgotten until the write is done, then updated in place when no
+    // trigger ran; otherwise it is read again on its next fetch.
+    std::optional<Row> avant;
+    if (retenue != lignes_.end()) avant.swap(retenue->second);
     sqlite3_stmt* st;
     if (ecrites.size() == cols.size()) {
       st = db_.prepare(updateSql_);
@@ -219,6 +266,16 @@ class SqliteStore : public TableStore {
       bindColumn(st, static_cast<int>(k) + 1, row, ecrites[k]);
     sqlite3_bind_int64(st, static_cast<int>(ecrites.size()) + 1, id);
     step(st, "update of " + name_);
+    if (avant && !declenche) {
+      for (size_t i : ecrites) {
+        auto valeur = i < row.values.size() ? fitColumn(cols[i], row.values[i])
+                                            : std::optional<Valeur>(defaultOf(cols[i].kind));
+        if (!valeur) return;  // cannot happen: the bind above fitted it
+        avant->values[i] = std::move(*valeur);
+      }
+      retenue = lignes_.find(id);
+      if (retenue != lignes_.end()) retenue->second = std::move(avant);
+    }
   }
 
   void remove(RowId id) override {
@@ -446,8 +503,9 @@ class SqliteStore : public TableStore {
   // is remembered once fetched; an empty entry is a row to remember on its next fetch).
   std::unordered_map<std::string, std::vector<RowId>> selections_;
   std::unordered_map<RowId, std::optional<Row>> lignes_;
-  std::vector<bool> colonnesCritere_;  // columns some remembered selection selects on
-  bool declencheurs_ = false;          // the table has triggers
+  std::vector<bool> colonnesCritere_;      // columns some remembered selection selects on
+  std::vector<bool> colonnesDeclencheur_;  // columns whose update fires a trigger
+  bool declencheTout_ = false;             // some trigger fires on any update
 };
 
 namespace {
