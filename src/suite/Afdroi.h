@@ -12,6 +12,7 @@ namespace quarvo::suite {
 
 class Afdroi : public host::Interface2 {
  public:
+  bool reutilisable() const override { return true; }  // keeps nothing between calls
   explicit Afdroi(host::Evt* evt);
 
  private:

@@ -11,6 +11,7 @@ namespace quarvo::suite {
 
 class Afmenu : public host::Interface2 {
  public:
+  bool reutilisable() const override { return true; }  // keeps nothing between calls
   explicit Afmenu(host::Evt* evt);
 
  private:

@@ -15,6 +15,7 @@ namespace quarvo::suite {
 
 class Afmouv : public host::Interface2 {
  public:
+  bool reutilisable() const override { return true; }  // keeps nothing between calls
   explicit Afmouv(host::Evt* evt);
 
  private:

@@ -10,6 +10,7 @@ namespace quarvo::suite {
 
 class Afpfst : public host::Interface2 {
  public:
+  bool reutilisable() const override { return true; }  // keeps nothing between calls
   explicit Afpfst(host::Evt* evt);
 };
 

@@ -17,6 +17,7 @@ namespace quarvo::suite {
 
 class Afresu : public host::Interface2 {
  public:
+  bool reutilisable() const override { return true; }  // keeps nothing between calls
   explicit Afresu(host::Evt* evt);
 
  private:

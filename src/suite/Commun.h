@@ -29,6 +29,7 @@ namespace quarvo::suite {
 
 class Commun : public host::Interface2 {
  public:
+  bool reutilisable() const override { return true; }  // keeps nothing between calls
   explicit Commun(host::Evt* evt);
 
   // The catalogue text of message `number` with its arguments, prefixed by its number.

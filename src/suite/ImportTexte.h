@@ -62,16 +62,16 @@ bool valideUtf8(const std::string& text);
 std::string depuisWindows1252(const std::string& text);
 
 struct ErreurChargement {
-  size_t ligne = 0;       // 0: the file as a whole
+  size_t ligne = 0;  // 0: the file as a whole
   std::string colonne;
   std::string valeur;
   std::string motif;
-  std::string piece;      // the line's "NUMERO_DOC" when known
+  std::string piece;  // the line's "NUMERO_DOC" when known
 };
 
 struct ResultatChargement {
   bool charge = false;
-  size_t lignes = 0;      // rows staged (0 when refused)
+  size_t lignes = 0;  // rows staged (0 when refused)
   std::vector<ErreurChargement> erreurs;
 };
 

@@ -41,6 +41,7 @@ class Gcpfour : public TableInterface {
 
 class Gcpstock : public host::Interface2 {
  public:
+  bool reutilisable() const override { return true; }  // keeps nothing between calls
   explicit Gcpstock(host::Evt* evt);
 
  private:
@@ -49,6 +50,7 @@ class Gcpstock : public host::Interface2 {
 
 class Gcpx : public host::Interface2 {
  public:
+  bool reutilisable() const override { return true; }  // keeps nothing between calls
   explicit Gcpx(host::Evt* evt);
 
  private:

@@ -14,6 +14,7 @@ namespace quarvo::suite {
 
 class Sysascii : public host::Interface2 {
  public:
+  bool reutilisable() const override { return true; }  // keeps nothing between calls
   explicit Sysascii(host::Evt* evt);
 
   static std::string remplacer(const std::string& text, const std::string& pattern,

@@ -15,6 +15,7 @@ namespace quarvo::suite {
 
 class TableInterface : public host::Interface2 {
  public:
+  bool reutilisable() const override { return true; }  // keeps nothing between calls
   explicit TableInterface(host::Evt* evt);
   void init(host::Evt* evt) override;
 

@@ -2,6 +2,7 @@
 
 #include <gtest/gtest.h>
 
+#include "host/automate/Interface2.h"
 #include "host/automate/Parcours.h"
 #include "host/automate/Registry.h"
 #include "host/automate/Traitmnt.h"
@@ -19,7 +20,8 @@ class Probe : public Traitmnt {
     lierParametres(evt, {{&count_, 0}, {&result_, 1}});
     addBranch("DEBUT", [this](Evt* e) { debut(e); });
     addBranch("FAIRE", [this](Evt* e) { faire(e); });
-    addBranch("TRANSFORMER(3,4)", [this](Evt* e) { log += "T" + std::to_string(e->numero()) + ";"; });
+    addBranch("TRANSFORMER(3,4)",
+              [this](Evt* e) { log += "T" + std::to_string(e->numero()) + ";"; });
     addBranch("VALIDER_PIECE", [](Evt*) { throw UException("disk full"); });
     addBranch("ECHOUER", [this](Evt* e) { erreurMethode(1, e); });
     addBranch("APPELS", [this](Evt* e) {
@@ -146,12 +148,14 @@ TEST(AutomateTest, ModuleRegistersInOrderWithTheCrashFlagFirst) {
 
 class GroupWalk : public Parcours {
  public:
-  explicit GroupWalk(Evt* evt) : Parcours(evt) {
-    nomTable("M_WALK");
+  explicit GroupWalk(Evt* evt, const char* table = "M_WALK") : Parcours(evt) {
+    nomTable(table);
     plan({"GROUP", "N"}, "GROUP");
     addBranch("DEBUT1", [this](Evt*) { log += "["; });
     addBranch("FIN1", [this](Evt*) { log += "]"; });
-    addBranch("POUR_TOUT", [this](Evt*) { log += courant().valeur("GROUP").toChaine() + courant().valeur("N").toChaine(); });
+    addBranch("POUR_TOUT", [this](Evt*) {
+      log += courant().valeur("GROUP").toChaine() + courant().valeur("N").toChaine();
+    });
     addBranch("FIN", [this](Evt*) { log += "."; });
   }
   std::string log;
@@ -160,7 +164,8 @@ class GroupWalk : public Parcours {
 TEST(AutomateTest, TraversalFollowsTheSortPlanWithLevelOneBreaks) {
   test::TestSession t;
   Table m(nullptr, "MEM:", "M_WALK", "");
-  for (auto [g, n] : std::vector<std::pair<const char*, int>>{{"b", 2}, {"a", 3}, {"b", 1}, {"a", 1}}) {
+  for (auto [g, n] :
+       std::vector<std::pair<const char*, int>>{{"b", 2}, {"a", 3}, {"b", 1}, {"a", 1}}) {
     m.preparer();
     m.ecrire("GROUP", Valeur::chaine(g));
     m.ecrire("N", Valeur::entier(n));
@@ -169,6 +174,79 @@ TEST(AutomateTest, TraversalFollowsTheSortPlanWithLevelOneBreaks) {
   GroupWalk w(nullptr);
   w.executer(nullptr);
   EXPECT_EQ(w.log, "[a1a3][b1b2].");
+
+  // On a persistent table the database orders the walk; numbers order as numbers.
+  t.sql(R"(CREATE TABLE "T_WALK" ("IDENT" TEXT PRIMARY KEY, "GROUP" TEXT, "N" INTEGER);
+            INSERT INTO "T_WALK" VALUES ('1', 'b', 10), ('2', 'a', 3), ('3', 'b', 9),
+                                        ('4', 'a', 1);)");
+  GroupWalk p(nullptr, "T_WALK");
+  p.executer(nullptr);
+  EXPECT_EQ(p.log, "[a1a3][b9b10].");
+}
+
+// An interface automaton the session keeps between calls: each call must find it as made.
+class Compteur : public Interface2 {
+ public:
+  explicit Compteur(Evt* evt) : Interface2(evt), appels_(entier("APPELS")) {
+    ++construits;
+    addBranch("COMPTER", [this](Evt* e) {
+      Field& sortie = chaine("P_SORTIE");  // bound to the caller's field for this call only
+      e->param(0, sortie, 1);
+      appels_.set(appels_.entier() + 1);
+      journal +=
+          champ("P_VU") == nullptr && tableParContexte("LOCALE") == nullptr ? "frais;" : "reste;";
+      chaine("P_VU").set("x");
+      Table locale(this, "", "M_COMPTEUR", "LOCALE");
+      sortie.set(appels_.entier());
+      erreurMethode(nomTable().empty() ? 0 : 1, e);
+      nomTable("M_AUTRE");
+    });
+    addBranch("IMBRIQUER", [this](Evt* e) {
+      Field& dedans = chaine("P_DEDANS");
+      EvtParamRef appel{ref(dedans)};
+      session().appelerProcedure("TEST", "COMPTER", &appel);
+      erreurMethode(0, e);
+    });
+    addBranch("FINIR", [this](Evt* e) {
+      erreurMethode(1, e);
+      sortir(e);
+    });
+  }
+  bool reutilisable() const override { return true; }
+  static inline int construits = 0;
+  static inline std::string journal;
+  Field& appels_;
+};
+
+TEST(AutomateTest, KeptInterfacesStartEachCallAsMade) {
+  test::TestSession t;
+  const Module compteur("", "TEST-INTERFACE", &fabriquer<Compteur>, false, "");
+  Compteur::construits = 0;
+  Compteur::journal.clear();
+  Field premier("A", "", "", 0, Kind::Chaine, Valeur::chaine(""), nullptr);
+  Field second("B", "", "", 0, Kind::Chaine, Valeur::chaine(""), nullptr);
+  EvtParamRef un{ref(premier)};
+  EXPECT_EQ(t.session().appelerProcedure("TEST", "COMPTER", &un), 0);
+  EvtParamRef deux{ref(second)};
+  EXPECT_EQ(t.session().appelerProcedure("TEST", "COMPTER", &deux), 0);
+  // Same instance, as made each time: counter from its initial value, no field or table left
+  // from the call before, the earlier caller's field no longer written.
+  EXPECT_EQ(Compteur::construits, 1);
+  EXPECT_EQ(Compteur::journal, "frais;frais;");
+  EXPECT_EQ(premier.text(), "1");
+  EXPECT_EQ(second.text(), "1");
+  // A call made while the kept one runs gets its own instance; both are kept afterwards.
+  EvtParamVal rien;
+  EXPECT_EQ(t.session().appelerProcedure("TEST", "IMBRIQUER", &rien), 0);
+  EXPECT_EQ(Compteur::construits, 2);
+  // One that ends itself is not kept: the other one serves, then a new one is made.
+  EXPECT_EQ(t.session().appelerProcedure("TEST", "FINIR", &rien), 1);
+  EXPECT_EQ(t.session().appelerProcedure("TEST", "COMPTER", &un), 0);
+  EXPECT_EQ(Compteur::construits, 2);
+  EXPECT_EQ(t.session().appelerProcedure("TEST", "FINIR", &rien), 1);
+  EXPECT_EQ(t.session().appelerProcedure("TEST", "COMPTER", &un), 0);
+  EXPECT_EQ(Compteur::construits, 3);
+  EXPECT_EQ(Compteur::journal, "frais;frais;frais;frais;frais;");
 }
 
 }  // namespace

@@ -47,6 +47,41 @@ Field* Automate::champ(const std::string& name) const {
   return it == fieldIndex_.end() ? nullptr : it->second;
 }
 
+void Automate::oublierTable(Table* table) {
+  // Tables go in the reverse order they came: the search starts from the end.
+  for (auto it = tables_.rbegin(); it != tables_.rend(); ++it) {
+    if (*it == table) {
+      tables_.erase(std::next(it).base());
+      return;
+    }
+  }
+}
+
+void Automate::marquerConstruit() {
+  construit_ = Construit{fields_.size(), base_, table_, screen_, modes_};
+}
+
+void Automate::reprendre() {
+  if (!construit_) return;
+  fields_.resize(construit_->champs);
+  fieldIndex_.clear();
+  for (auto& field : fields_) {
+    field->bindReference(nullptr);
+    field->reset();
+    fieldIndex_[field->name()] = field.get();
+  }
+  base_ = construit_->base;
+  table_ = construit_->table;
+  screen_ = construit_->screen;
+  modes_ = construit_->modes;
+  ecran_.reset();
+  numero_ = 0;
+  outcome_ = 0;
+  callOutcome_ = 0;
+  ended_ = false;
+  rejected_ = false;
+}
+
 Table* Automate::tableParContexte(const std::string& contextOrName) const {
   for (Table* t : tables_) {
     if (!t->context().empty() && t->context() == contextOrName) return t;

@@ -15,6 +15,7 @@
 #include <functional>
 #include <map>
 #include <memory>
+#include <optional>
 #include <string>
 #include <vector>
 
@@ -66,6 +67,16 @@ class Automate {
   const std::vector<std::unique_ptr<Field>>& champs() const { return fields_; }
   Table* tableParContexte(const std::string& contextOrName) const;
   void enregistrerTable(Table* table) { tables_.push_back(table); }
+  void oublierTable(Table* table);
+
+  // Reuse by the session (interface automata are kept between calls). marquerConstruit() notes
+  // what construction left; reprendre() brings the automaton back to that: fields declared
+  // since are dropped, the others hold their initial values unbound, outcome and end cleared.
+  void marquerConstruit();
+  void reprendre();
+  // True for automata the session may keep between calls: they hold nothing of their own from
+  // one call to the next beyond what construction made (no member cursors, no member state).
+  virtual bool reutilisable() const { return false; }
 
   // Dispatch. Returns false when no branch is bound to `label`.
   bool hasBranch(const std::string& label) const;
@@ -162,6 +173,11 @@ class Automate {
   std::vector<Branch> branches_;
   const Branch* branche(const std::string& label) const;
   std::unique_ptr<Ecran> ecran_;
+  struct Construit {
+    size_t champs = 0;
+    std::string base, table, screen, modes;
+  };
+  std::optional<Construit> construit_;
   int numero_ = 0;
   int outcome_ = 0;
   int callOutcome_ = 0;

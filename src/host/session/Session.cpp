@@ -18,10 +18,16 @@ Session& Session::current() {
   if (currentSession == nullptr) throw UException("no session is open");
   return *currentSession;
 }
-bool Session::hasCurrent() { return currentSession != nullptr; }
+bool Session::hasCurrent() {
+  return currentSession != nullptr;
+}
 
-Session::Scope::Scope(Session& s) : previous_(currentSession) { currentSession = &s; }
-Session::Scope::~Scope() { currentSession = previous_; }
+Session::Scope::Scope(Session& s) : previous_(currentSession) {
+  currentSession = &s;
+}
+Session::Scope::~Scope() {
+  currentSession = previous_;
+}
 
 bool Session::isMemoryName(const std::string& name) {
   return name.rfind("M_", 0) == 0 || name.rfind("MEM:", 0) == 0 || name.rfind("I_", 0) == 0;
@@ -88,10 +94,19 @@ size_t Session::fenetresOuvertes() {
 }
 
 int Session::appelerProcedure(const std::string& module, const std::string& label, Evt* evt) {
-  AutomatePtr automate = creer(module + "-INTERFACE", nullptr);
-  if (!automate) {
-    ui_.incident("Le module " + module + " n'est pas disponible.");
-    return 1;
+  AutomatePtr automate;
+  std::vector<AutomatePtr>& libres = interfaces_[module];
+  if (!libres.empty()) {
+    automate = std::move(libres.back());
+    libres.pop_back();
+    automate->reprendre();
+  } else {
+    automate = creer(module + "-INTERFACE", nullptr);
+    if (!automate) {
+      ui_.incident("Le module " + module + " n'est pas disponible.");
+      return 1;
+    }
+    automate->marquerConstruit();
   }
   Scope scope(*this);
   EvtParamVal none;
@@ -101,10 +116,17 @@ int Session::appelerProcedure(const std::string& module, const std::string& labe
     ui_.incident("La procédure " + label + " n'existe pas dans le module " + module + ".");
     return 1;
   }
-  return e->erreur();
+  int outcome = e->erreur();
+  // Kept for the next call when it may be, and unless it ended itself.
+  if (automate->reutilisable() && !automate->termine()) {
+    interfaces_[module].push_back(std::move(automate));
+  }
+  return outcome;
 }
 
-void Session::lancer(std::function<void()> work) { pending_.push_back(std::move(work)); }
+void Session::lancer(std::function<void()> work) {
+  pending_.push_back(std::move(work));
+}
 
 void Session::executerEnAttente() {
   if (running_) return;  // the loop that is running will reach the new work

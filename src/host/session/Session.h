@@ -13,6 +13,7 @@
 #include <map>
 #include <memory>
 #include <string>
+#include <unordered_map>
 #include <vector>
 
 #include "host/automate/Registry.h"
@@ -84,6 +85,10 @@ class Session {
   std::deque<std::function<void()>> pending_;
   std::vector<AutomatePtr> windows_;
   bool running_ = false;
+  // Interface automata between two calls, by module: a batch calls the same few interfaces
+  // for every line, and making one costs more than most calls. Several are kept when calls
+  // nest. Declared last, so destroyed first.
+  std::unordered_map<std::string, std::vector<AutomatePtr>> interfaces_;
 };
 
 }  // namespace quarvo::host

@@ -20,13 +20,11 @@ std::string sqlIdent(const std::string& identifier) {
   return out + "\"";
 }
 
-// RAII reset of a cached statement.
+// RAII reset of a cached statement. Bindings are left as they are: every use of a statement
+// binds all its parameters again.
 struct Reset {
   sqlite3_stmt* stmt;
-  ~Reset() {
-    sqlite3_reset(stmt);
-    sqlite3_clear_bindings(stmt);
-  }
+  ~Reset() { sqlite3_reset(stmt); }
 };
 
 }  // namespace
@@ -203,7 +201,8 @@ class SqliteStore : public TableStore {
   }
 
   bool lireLigne(RowId id, Row& out) {
-    sqlite3_stmt* st = db_.prepare(fetchSql_);
+    if (fetchSt_ == nullptr) fetchSt_ = db_.prepare(fetchSql_);
+    sqlite3_stmt* st = fetchSt_;
     Reset reset{st};
     sqlite3_bind_int64(st, 1, id);
     int rc = sqlite3_step(st);
@@ -218,10 +217,11 @@ class SqliteStore : public TableStore {
 
   RowId insert(const Row& row) override {
     selections_.clear();  // the new row may match any of them
-    sqlite3_stmt* st = db_.prepare(insertSql_);
+    if (insertSt_ == nullptr) insertSt_ = db_.prepare(insertSql_);
+    sqlite3_stmt* st = insertSt_;
     Reset reset{st};
     bindRow(st, row);
-    step(st, "insert into " + name_);
+    step(st, "insert into");
     return sqlite3_last_insert_rowid(db_.handle());
   }
 
@@ -250,22 +250,24 @@ class SqliteStore : public TableStore {
     // trigger ran; otherwise it is read again on its next fetch.
     std::optional<Row> avant;
     if (retenue != lignes_.end()) avant.swap(retenue->second);
-    sqlite3_stmt* st;
-    if (ecrites.size() == cols.size()) {
-      st = db_.prepare(updateSql_);
-    } else {
-      std::string sql = "UPDATE " + sqlIdent(name_) + " SET ";
-      for (size_t k = 0; k < ecrites.size(); ++k) {
-        if (k > 0) sql += ", ";
-        sql += sqlIdent(cols[ecrites[k]].name) + " = ?";
+    sqlite3_stmt*& st = updates_[ecrites];
+    if (st == nullptr) {
+      if (ecrites.size() == cols.size()) {
+        st = db_.prepare(updateSql_);
+      } else {
+        std::string sql = "UPDATE " + sqlIdent(name_) + " SET ";
+        for (size_t k = 0; k < ecrites.size(); ++k) {
+          if (k > 0) sql += ", ";
+          sql += sqlIdent(cols[ecrites[k]].name) + " = ?";
+        }
+        st = db_.prepare(sql + " WHERE rowid = ?");
       }
-      st = db_.prepare(sql + " WHERE rowid = ?");
     }
     Reset reset{st};
     for (size_t k = 0; k < ecrites.size(); ++k)
       bindColumn(st, static_cast<int>(k) + 1, row, ecrites[k]);
     sqlite3_bind_int64(st, static_cast<int>(ecrites.size()) + 1, id);
-    step(st, "update of " + name_);
+    step(st, "update of");
     if (avant && !declenche) {
       for (size_t i : ecrites) {
         auto valeur = i < row.values.size() ? fitColumn(cols[i], row.values[i])
@@ -284,7 +286,7 @@ class SqliteStore : public TableStore {
     sqlite3_stmt* st = db_.prepare("DELETE FROM " + sqlIdent(name_) + " WHERE rowid = ?");
     Reset reset{st};
     sqlite3_bind_int64(st, 1, id);
-    step(st, "delete from " + name_);
+    step(st, "delete from");
   }
 
   int64_t removeAll(const std::vector<Criterion>& criteria) override {
@@ -293,7 +295,7 @@ class SqliteStore : public TableStore {
     sqlite3_stmt* st = db_.prepare("DELETE FROM " + sqlIdent(name_) + where(criteria, binds));
     Reset reset{st};
     bindAll(st, binds, 1);
-    step(st, "delete from " + name_);
+    step(st, "delete from");
     return sqlite3_changes(db_.handle());
   }
 
@@ -349,13 +351,15 @@ class SqliteStore : public TableStore {
     return false;
   }
 
-  void step(sqlite3_stmt* st, const std::string& what) {
+  // Runs a statement that returns no rows; `what` ("insert into") names it in errors.
+  void step(sqlite3_stmt* st, const char* what) {
     int rc = sqlite3_step(st);
     if (rc == SQLITE_DONE) return;
+    std::string quoi = std::string(what) + " " + name_;
     if ((rc & 0xff) == SQLITE_CONSTRAINT) {
-      throw ConstraintError(what + ": " + sqlite3_errmsg(db_.handle()));
+      throw ConstraintError(quoi + ": " + sqlite3_errmsg(db_.handle()));
     }
-    db_.fail(what);
+    db_.fail(quoi);
   }
 
   std::string where(const std::vector<Criterion>& criteria, std::vector<Valeur>& binds) {
@@ -498,6 +502,10 @@ class SqliteStore : public TableStore {
   std::string fetchSql_;
   std::string insertSql_;
   std::string updateSql_;
+  // Statements of this table, prepared once (the database's cache owns them).
+  sqlite3_stmt* fetchSt_ = nullptr;
+  sqlite3_stmt* insertSt_ = nullptr;
+  std::map<std::vector<size_t>, sqlite3_stmt*> updates_;  // by the columns written
   // What was read inside transactions while no other connection changed the file (see
   // SqliteDatabase::memoireActive): selections by their criteria, and the rows they gave (a row
   // is remembered once fetched; an empty entry is a row to remember on its next fetch).

@@ -44,7 +44,7 @@ class SqliteDatabase : public Database {
   void rollback() override;
   int depth() const override { return depth_; }
 
-  // A prepared statement from the cache, reset and with its bindings cleared.
+  // A prepared statement from the cache, reset (its parameters keep their last bindings).
   sqlite3_stmt* prepare(const std::string& sql);
   sqlite3* handle() { return db_; }
   [[noreturn]] void fail(const std::string& what);

@@ -17,6 +17,10 @@ Table::Table(Automate* owner, std::string base, std::string name, std::string co
   if (owner_ != nullptr) owner_->enregistrerTable(this);
 }
 
+Table::~Table() {
+  if (owner_ != nullptr) owner_->oublierTable(this);
+}
+
 Session& Table::session() {
   return owner_ != nullptr ? owner_->session() : Session::current();
 }

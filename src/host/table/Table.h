@@ -28,6 +28,8 @@ class Table {
   Table(Automate* owner, std::string base, std::string name, std::string context,
         const char* unused1 = nullptr, const char* unused2 = nullptr, char kind = 'E',
         int unused3 = 1);
+  // A table made in a handler goes away with it: its automaton forgets it.
+  ~Table();
   Table(const Table&) = delete;
   Table& operator=(const Table&) = delete;
 
