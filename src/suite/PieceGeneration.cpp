@@ -18,10 +18,9 @@ constexpr const char* kEtat = "M_GENERATION";
 constexpr const char* kErreurs = "M_GENERATION_ERREUR";
 
 // Columns of the exchange record that describe one line.
-constexpr const char* kColonnesLigne[] = {"GCPARTIC_IDENT", "GCPARTIC_CODE", "DESIG",
-                                          "QTE",            "PUHT",          "TAUX_REMISE",
-                                          "GCPDEPOT_IDENT", "SECAN_CODE",    "GCPTVA_IDENT",
-                                          "STYLE"};
+constexpr const char* kColonnesLigne[] = {
+    "GCPARTIC_IDENT", "GCPARTIC_CODE",  "DESIG",      "QTE",          "PUHT",
+    "TAUX_REMISE",    "GCPDEPOT_IDENT", "SECAN_CODE", "GCPTVA_IDENT", "STYLE"};
 
 std::string heureCourante() {
   std::time_t t = std::time(nullptr);
@@ -44,7 +43,9 @@ PieceGeneration::PieceGeneration(Evt* evt) : TableInterface(evt) {
   addBranch("VALIDE_DOCUMENT", [this](Evt* e) { valideDocument(e); });
 }
 
-std::string PieceGeneration::lignes() const { return "GAPL" + table().substr(4); }
+std::string PieceGeneration::lignes() const {
+  return "GAPL" + table().substr(4);
+}
 
 void PieceGeneration::echec(Evt* evt, const std::string& text) {
   Table erreurs(this, "", kErreurs, "");
@@ -141,6 +142,10 @@ void PieceGeneration::debutPieceGeneree(Evt* evt) {
   }
   etat.ecrire("PIECE_IDENT", Valeur::chaine(nouveau));
   etat.ecrire("RANG", Valeur::entier(0));
+  etat.ecrire("REGIME", four.valeur("GCPREGM_IDENT"));
+  etat.ecrire("BRUT", Valeur::monnaie(Monnaie()));
+  etat.ecrire("TVA", Valeur::monnaie(Monnaie()));
+  etat.ecrire("QTE", Valeur::dbl(0.0));
   etat.modifier();
   ident.set(nouveau);
   erreurMethode(0, evt);
@@ -176,12 +181,14 @@ void PieceGeneration::ligneCopiee(Evt* evt) {
                           "SECAN_CODE", "GCPTVA_IDENT"}) {
     ligne.ecrire(col, Valeur::chaine(genere.valeur(col).toChaine()));
   }
+  Monnaie ht;
+  double qte = 0;
   if (!commentaire) {
-    double qte = toDouble(genere.valeur("QTE"));
+    qte = toDouble(genere.valeur("QTE"));
     Monnaie puht = toMonnaie(genere.valeur("PUHT"));
     double remise = toDouble(genere.valeur("TAUX_REMISE"));
     Monnaie brut = valeurArrondie(puht * qte, 2, '=');
-    Monnaie ht = valeurArrondie(brut - brut * (remise / 100.0), 2, '=');
+    ht = valeurArrondie(brut - brut * (remise / 100.0), 2, '=');
     ligne.ecrire("QTE", Valeur::dbl(qte));
     ligne.ecrire("PUHT", Valeur::monnaie(puht));
     ligne.ecrire("TAUX_REMISE", Valeur::dbl(remise));
@@ -193,6 +200,22 @@ void PieceGeneration::ligneCopiee(Evt* evt) {
                    " n'a pas pu être enregistrée.");
     return;
   }
+  // The piece's running totals: the line's amount, its VAT at the rate of its code in the
+  // piece's regime (to the cent), its quantity.
+  Monnaie tva;
+  std::string code = genere.valeur("GCPTVA_IDENT").toChaine();
+  if (!commentaire && !code.empty()) {
+    Table taux(this, "GESCOM", "GCPTXTVA", "TOTAUX");
+    taux.effacerCriteres();
+    taux.ajouterCritere("GCPREGM_IDENT", '=', etat.valeur("REGIME"));
+    taux.ajouterCritere("GCPTVA_IDENT", '=', Valeur::chaine(code));
+    if (taux.lire(3) == 0) {
+      tva = valeurArrondie(ht * (toDouble(taux.valeur("TAUX")) / 100.0), 2, '=');
+    }
+  }
+  etat.ecrire("BRUT", Valeur::monnaie(toMonnaie(etat.valeur("BRUT")) + ht));
+  etat.ecrire("TVA", Valeur::monnaie(toMonnaie(etat.valeur("TVA")) + tva));
+  etat.ecrire("QTE", Valeur::dbl(toDouble(etat.valeur("QTE")) + qte));
   etat.ecrire("RANG", Valeur::entier(rang));
   etat.modifier();
   erreurMethode(0, evt);
@@ -208,28 +231,9 @@ void PieceGeneration::finPieceGeneree(Evt* evt) {
     echec(evt, "Aucune pièce " + table() + " n'est en cours de génération.");
     return;
   }
-  std::string regime = piece.valeur("GCPREGM_IDENT").toChaine();
-  Table ligne(this, "GESCOM", lignes(), "TOTAUX");
-  ligne.effacerCriteres();
-  ligne.ajouterCritere("NUMERO", '/', Valeur::chaine(ident + "|"));
-  ligne.ouvrir();
-  Table taux(this, "GESCOM", "GCPTXTVA", "TOTAUX");
-  Monnaie brut;
-  Monnaie tva;
-  double quantite = 0;
-  while (ligne.lire(1) == 0) {
-    Monnaie ht = toMonnaie(ligne.valeur("HT"));
-    brut += ht;
-    quantite += toDouble(ligne.valeur("QTE"));
-    std::string code = ligne.valeur("GCPTVA_IDENT").toChaine();
-    if (code.empty()) continue;
-    taux.effacerCriteres();
-    taux.ajouterCritere("GCPREGM_IDENT", '=', Valeur::chaine(regime));
-    taux.ajouterCritere("GCPTVA_IDENT", '=', Valeur::chaine(code));
-    if (taux.lire(3) == 0) {
-      tva += valeurArrondie(ht * (toDouble(taux.valeur("TAUX")) / 100.0), 2, '=');
-    }
-  }
+  Monnaie brut = toMonnaie(etat.valeur("BRUT"));
+  Monnaie tva = toMonnaie(etat.valeur("TVA"));
+  double quantite = toDouble(etat.valeur("QTE"));
   double remise = toDouble(piece.valeur("TAUX_REMISE"));
   double escompte = toDouble(piece.valeur("TAUX_ESCOMPTE"));
   Monnaie net = valeurArrondie(brut - brut * (remise / 100.0), 2, '=');

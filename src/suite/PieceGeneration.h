@@ -26,6 +26,9 @@
 //   module's generation protocol in the session.
 // - "VALIDE_DOCUMENT" (piece identifier): "VALIDEE" = 1; fails when the piece does not exist.
 // The generation state lives in the session's memory table "M_GENERATION" (one row per module).
+// It also keeps the running totals of the current piece (lines' "HT", their VAT, quantities),
+// added up as each line is copied: lines reach a generated piece only through "LIGNE_COPIEE",
+// so "FIN_PIECE_GENEREE" need not read them back.
 #pragma once
 
 #include "suite/TableInterface.h"

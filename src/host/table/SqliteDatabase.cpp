@@ -545,7 +545,8 @@ SqliteDatabase::SqliteDatabase(const std::filesystem::path& path, bool create) :
   try {
     execScript(
         "PRAGMA journal_mode = WAL; PRAGMA synchronous = NORMAL; PRAGMA foreign_keys = OFF; "
-        "PRAGMA cache_size = -65536; PRAGMA mmap_size = 268435456;");
+        "PRAGMA cache_size = -65536; PRAGMA mmap_size = 268435456; PRAGMA wal_autocheckpoint = "
+        "8192;");
   } catch (...) {
     // A file that is not a database fails here: the destructor will not run, so close now.
     for (auto& [sql, st] : statements_) sqlite3_finalize(st);
