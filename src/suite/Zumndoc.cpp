@@ -1,6 +1,7 @@
 #include "suite/Zumndoc.h"
 
 #include <charconv>
+#include <optional>
 
 #include "host/session/Session.h"
 #include "host/table/Table.h"
@@ -54,7 +55,10 @@ void Zumndoc::attribuer(Evt* evt) {
     erreurMethode(1, evt);
     return;
   }
-  Transaction tx(session().db());
+  // Read and advance the counter under the write lock. Inside a caller's transaction the lock
+  // is already held and the single write below is atomic: no savepoint of its own is needed.
+  std::optional<Transaction> tx;
+  if (session().db().depth() == 0) tx.emplace(session().db());
   Table counter(this, r.base, "ZUMNDOC", "COMPTEUR");
   counter.effacerCriteres();
   counter.ajouterCritere("MODULE", '=', Valeur::chaine(r.table));
@@ -82,7 +86,7 @@ void Zumndoc::attribuer(Evt* evt) {
     counter.ecrire("DERNIER", Valeur::entier(next));
     counter.inserer();
   }
-  tx.commit();
+  if (tx) tx->commit();
   ident.set(padded(next, r.width));
   erreurMethode(0, evt);
 }

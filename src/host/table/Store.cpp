@@ -1,5 +1,8 @@
 #include "host/table/Store.h"
 
+#include <cstdint>
+#include <cstring>
+
 namespace quarvo::host {
 
 Kind valueKindOf(ColKind k) {
@@ -28,16 +31,51 @@ ColKind colKindFromDeclared(const std::string& declared) {
   return ColKind::Text;
 }
 
-std::optional<size_t> TableSchema::index(const std::string& column) const {
-  auto it = index_.find(column);
-  if (it == index_.end()) return std::nullopt;
-  return it->second;
+namespace {
+// Column names are short and differ early or late: a hash of their length and of their first
+// and last eight bytes is enough, and costs a few instructions whatever the name.
+uint64_t hacher(std::string_view s) {
+  uint64_t debut = 0;
+  uint64_t fin = 0;
+  const size_t n = s.size();
+  std::memcpy(&debut, s.data(), n < 8 ? n : 8);
+  if (n > 8) std::memcpy(&fin, s.data() + n - 8, 8);
+  uint64_t h = (debut * 0x9E3779B97F4A7C15ull) ^ (fin * 0xC2B2AE3D27D4EB4Full) ^ n;
+  return h ^ (h >> 29);
+}
+}  // namespace
+
+std::optional<size_t> TableSchema::index(std::string_view column) const {
+  if (slots_.empty()) return std::nullopt;
+  const size_t masque = slots_.size() - 1;
+  for (size_t s = hacher(column) & masque; slots_[s] != 0; s = (s + 1) & masque) {
+    const std::string& nom = columns_[slots_[s] - 1].name;
+    if (nom.size() == column.size() && std::memcmp(nom.data(), column.data(), nom.size()) == 0) {
+      return slots_[s] - 1;
+    }
+  }
+  return std::nullopt;
+}
+
+void TableSchema::placer(size_t position) {
+  const size_t masque = slots_.size() - 1;
+  size_t s = hacher(columns_[position].name) & masque;
+  while (slots_[s] != 0) s = (s + 1) & masque;
+  slots_[s] = static_cast<uint32_t>(position + 1);
 }
 
 size_t TableSchema::add(ColumnInfo info) {
   if (auto i = index(info.name)) return *i;
-  columns_.push_back(info);
-  index_.emplace(info.name, columns_.size() - 1);
+  columns_.push_back(std::move(info));
+  if (columns_.size() * 2 > slots_.size()) {
+    // At most half full, so that a search ends quickly on an empty slot.
+    size_t taille = 16;
+    while (taille < columns_.size() * 4) taille *= 2;
+    slots_.assign(taille, 0);
+    for (size_t i = 0; i < columns_.size(); ++i) placer(i);
+  } else {
+    placer(columns_.size() - 1);
+  }
   return columns_.size() - 1;
 }
 

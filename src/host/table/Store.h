@@ -10,6 +10,7 @@
 #include <memory>
 #include <optional>
 #include <string>
+#include <string_view>
 #include <unordered_map>
 #include <vector>
 
@@ -33,14 +34,18 @@ struct ColumnInfo {
 class TableSchema {
  public:
   const std::vector<ColumnInfo>& columns() const { return columns_; }
-  std::optional<size_t> index(const std::string& column) const;
+  // Every read and write of a column by name goes through here: an open-addressing table of
+  // column positions, looked up without building a string.
+  std::optional<size_t> index(std::string_view column) const;
   size_t add(ColumnInfo info);
   const std::vector<size_t>& key() const { return key_; }
   void setKey(std::vector<size_t> key) { key_ = std::move(key); }
 
  private:
+  void placer(size_t position);
+
   std::vector<ColumnInfo> columns_;
-  std::unordered_map<std::string, size_t> index_;
+  std::vector<uint32_t> slots_;  // column position + 1; 0 is an empty slot; size a power of 2
   std::vector<size_t> key_;
 };
 
