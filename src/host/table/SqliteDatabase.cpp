@@ -458,6 +458,12 @@ class SqliteStore : public TableStore {
         case Kind::Double:
           sqlite3_bind_double(st, n, v.asDouble());
           return;
+        case Kind::Monnaie:
+        case Kind::Date: {
+          std::string text = v.kind() == Kind::Monnaie ? v.asMonnaie().text() : v.asDate().iso();
+          sqlite3_bind_text(st, n, text.data(), static_cast<int>(text.size()), SQLITE_TRANSIENT);
+          return;
+        }
         default:
           bindValue(st, n, storageForm(col.kind, v));
           return;
