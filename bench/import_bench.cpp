@@ -54,7 +54,9 @@ double secondes(Clock::time_point from) {
   return std::chrono::duration<double>(Clock::now() - from).count();
 }
 
-int flagOf(host::Field& f) { return static_cast<int>(f.entier()); }
+int flagOf(host::Field& f) {
+  return static_cast<int>(f.entier());
+}
 
 }  // namespace
 
@@ -102,10 +104,11 @@ int main(int argc, char** argv) {
     std::vector<double> imports;
     for (int essai = 0; essai < 3; ++essai) {
       fs::path bare = dir / ("bare" + std::to_string(essai) + ".db");
-      std::string create = "sqlite3 " + bare.string() +
-                           " \"CREATE TABLE t(c1,c2,c3,c4,c5,c6,c7,c8,c9,c10,c11,c12,c13,c14,c15)\"";
-      std::string import = "sqlite3 " + bare.string() + " -cmd \".mode tabs\" \".import " +
-                           file.string() + " t\"";
+      std::string create =
+          "sqlite3 " + bare.string() +
+          " \"CREATE TABLE t(c1,c2,c3,c4,c5,c6,c7,c8,c9,c10,c11,c12,c13,c14,c15)\"";
+      std::string import =
+          "sqlite3 " + bare.string() + " -cmd \".mode tabs\" \".import " + file.string() + " t\"";
       if (std::system(create.c_str()) != 0) break;
       auto t3 = Clock::now();
       if (std::system(import.c_str()) != 0) break;
@@ -117,10 +120,10 @@ int main(int argc, char** argv) {
       tSqlite = imports[1];
     }
 
-    std::cout << std::fixed << std::setprecision(3) << lines << " lines ("
-              << (lines + 4) / 5 << " orders): load " << tLoad << " s (flag " << loadFlag
-              << "), control " << tControl << " s (flag " << controlFlag << "), generation "
-              << tGeneration << " s, total " << total << " s";
+    std::cout << std::fixed << std::setprecision(3) << lines << " lines (" << (lines + 4) / 5
+              << " orders): load " << tLoad << " s (flag " << loadFlag << "), control " << tControl
+              << " s (flag " << controlFlag << "), generation " << tGeneration << " s, total "
+              << total << " s";
     if (tSqlite > 0) {
       std::cout << "; sqlite3 .import " << tSqlite << " s; ratio " << std::setprecision(1)
                 << total / tSqlite << "x";

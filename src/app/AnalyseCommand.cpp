@@ -12,7 +12,6 @@ namespace quarvo::app {
 
 using namespace host;
 
-
 int runAnalyse(Session& session, const std::string& kind, const std::string& ident,
                std::ostream& out) {
   Session::Scope scope(session);
@@ -49,7 +48,8 @@ int runAnalyse(Session& session, const std::string& kind, const std::string& ide
 
   out << "Accounting analysis of " << table << " " << pieceIdent << " (" << numero << ")\n";
   bool failed = erreur.text() == "1" || journal;
-  if (!added.empty()) printTable(out, {"Number", "Component", "Code", "Designation", "Comment"}, added);
+  if (!added.empty())
+    printTable(out, {"Number", "Component", "Code", "Designation", "Comment"}, added);
   if (!failed) {
     out << "No error: the piece can be carried into the accounting.\n";
     return 0;

@@ -102,9 +102,10 @@ int importAuto(Session& session, std::ostream& out) {
 
 int runImport(Session& session, const ImportOptions& o, std::ostream& out) {
   if (o.automatique) return importAuto(session, out);
-  const std::array<std::pair<const char*, std::string>, 4> files{
-      {{"V_FICHIER_DF", o.df}, {"V_FICHIER_CF", o.cf}, {"V_FICHIER_BF", o.bf},
-       {"V_FICHIER_FF", o.ff}}};
+  const std::array<std::pair<const char*, std::string>, 4> files{{{"V_FICHIER_DF", o.df},
+                                                                  {"V_FICHIER_CF", o.cf},
+                                                                  {"V_FICHIER_BF", o.bf},
+                                                                  {"V_FICHIER_FF", o.ff}}};
   if (std::all_of(files.begin(), files.end(), [](const auto& f) { return f.second.empty(); })) {
     throw UsageError("name at least one file (--df, --cf, --bf, --ff) or use --auto");
   }

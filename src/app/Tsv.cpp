@@ -86,18 +86,16 @@ size_t loadTsv(Session& session, const std::string& table, std::istream& in,
     if (line.empty()) continue;
     auto cells = splitTabs(line);
     if (cells.size() != header.size()) {
-      throw UsageError(source + ":" + std::to_string(lineNo) + ": " +
-                       std::to_string(cells.size()) + " values for " +
-                       std::to_string(header.size()) + " columns");
+      throw UsageError(source + ":" + std::to_string(lineNo) + ": " + std::to_string(cells.size()) +
+                       " values for " + std::to_string(header.size()) + " columns");
     }
     cursor.preparer();
     for (size_t i = 0; i < cells.size(); ++i) {
       std::string value = unescapeTsv(cells[i]);
       if (!cursor.ecrire(header[i], Valeur::chaine(value))) {
         const auto& col = store.schema().columns()[*store.schema().index(header[i])];
-        throw UsageError(source + ":" + std::to_string(lineNo) + ": column " + header[i] +
-                         ": '" + value + "' is not a valid " +
-                         kindName(valueKindOf(col.kind)));
+        throw UsageError(source + ":" + std::to_string(lineNo) + ": column " + header[i] + ": '" +
+                         value + "' is not a valid " + kindName(valueKindOf(col.kind)));
       }
     }
     if (cursor.inserer() != 0) {
@@ -116,7 +114,8 @@ size_t dumpTsv(Session& session, const std::string& table,
   Table cursor(nullptr, "VOVOVA", table, "EXPORT");
   cursor.effacerCriteres();
   for (const auto& [col, value] : where) {
-    if (!store.schema().index(col)) throw UsageError("table " + table + " has no column '" + col + "'");
+    if (!store.schema().index(col))
+      throw UsageError("table " + table + " has no column '" + col + "'");
     cursor.ajouterCritere(col, '=', Valeur::chaine(value));
   }
   const auto& columns = store.schema().columns();

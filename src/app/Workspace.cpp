@@ -57,7 +57,8 @@ std::unique_ptr<SqliteDatabase> connect(const std::filesystem::path& file, bool 
 
 std::unique_ptr<Workspace> Workspace::open(const std::filesystem::path& file) {
   if (!std::filesystem::exists(file)) {
-    throw UsageError("database " + file.string() + " does not exist (create it with 'quarvo init')");
+    throw UsageError("database " + file.string() +
+                     " does not exist (create it with 'quarvo init')");
   }
   auto db = connect(file, false);
   if (kindOf(*db) != "yes") throw UsageError(file.string() + " is not a QUARVO database");

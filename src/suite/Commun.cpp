@@ -94,7 +94,8 @@ Commun::Commun(Evt* evt) : Interface2(evt) {
   addBranch("BORNE_DATE", [this](Evt* e) { borneDate(*this, e); });
   addBranch("BOITE_SORTIR", [this](Evt*) { session().ui().attenteFin(); });
   addBranch("IMPORT_CHARGER_TXT", [this](Evt* e) { ImportTexte::chargerTxt(*this, e); });
-  addBranch("IMPORT_CONSULTER_ERREURS", [this](Evt* e) { ImportTexte::consulterErreurs(*this, e); });
+  addBranch("IMPORT_CONSULTER_ERREURS",
+            [this](Evt* e) { ImportTexte::consulterErreurs(*this, e); });
   addBranch("IMPORT_SAUVER_ERREURS", [this](Evt* e) { ImportTexte::sauverErreurs(*this, e); });
 }
 
@@ -144,7 +145,8 @@ void Commun::lireLibel(Evt* evt) {
 
 void Commun::faitLabel(Evt* evt) {
   std::string label = evt->valeur(0).toChaine();
-  if (!label.empty() && label[0] >= 'a' && label[0] <= 'z') label[0] = static_cast<char>(label[0] - 32);
+  if (!label.empty() && label[0] >= 'a' && label[0] <= 'z')
+    label[0] = static_cast<char>(label[0] - 32);
   answer(*this, evt, 1, label.empty() ? label : label + " :");
   erreurMethode(0, evt);
 }

@@ -108,7 +108,7 @@ void Gapartfo::lectureEtCreation(Evt* evt) {
     }
     Table art(this, "GESCOM", "GCPARTIC", "LIEN");
     Valeur prix = art.chercher(3, "IDENT", '=', article) == 0 ? art.valeur("PUHT")
-                                                               : Valeur::monnaie(Monnaie());
+                                                              : Valeur::monnaie(Monnaie());
     lien.preparer();
     lien.ecrire("IDENT", Valeur::chaine(ident));
     lien.ecrire("GCPARTIC_IDENT", article);

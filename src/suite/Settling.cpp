@@ -32,7 +32,9 @@ std::string tableLignes(int64_t typePiece) {
 namespace {
 
 // The row `IDENT` = `ident` of `table` in a fresh cursor; false when there is none.
-bool trouver(Table& t, const Valeur& ident) { return t.chercher(3, "IDENT", '=', ident) == 0; }
+bool trouver(Table& t, const Valeur& ident) {
+  return t.chercher(3, "IDENT", '=', ident) == 0;
+}
 
 }  // namespace
 
@@ -109,7 +111,8 @@ void Gcpstock::soldeLigne(Evt* evt) {
     erreurMethode(0, evt);
     return;
   }
-  double attendue = std::max(0.0, toDouble(stock.valeur("QTE_ATTENDUE")) - toDouble(evt->valeur(2)));
+  double attendue =
+      std::max(0.0, toDouble(stock.valeur("QTE_ATTENDUE")) - toDouble(evt->valeur(2)));
   stock.ecrire("QTE_ATTENDUE", Valeur::dbl(attendue));
   erreurMethode(stock.modifier(), evt);
 }

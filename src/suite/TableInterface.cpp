@@ -9,12 +9,10 @@ using namespace host;
 
 TableInterface::TableInterface(Evt* evt) : Interface2(evt) {
   addBranch("INIT", [this](Evt* e) { init(e); });
-  addBranch("LECTURE_CODE", [this](Evt* e) {
-    erreurMethode(lireDans("CODE", e->valeur(0)) ? 0 : 1, e);
-  });
-  addBranch("LECTURE_NUMERO_DOC", [this](Evt* e) {
-    erreurMethode(lireDans("NUMERO_DOC", e->valeur(0)) ? 0 : 1, e);
-  });
+  addBranch("LECTURE_CODE",
+            [this](Evt* e) { erreurMethode(lireDans("CODE", e->valeur(0)) ? 0 : 1, e); });
+  addBranch("LECTURE_NUMERO_DOC",
+            [this](Evt* e) { erreurMethode(lireDans("NUMERO_DOC", e->valeur(0)) ? 0 : 1, e); });
   addBranch("ECRITURE", [this](Evt* e) { ecriture(e); });
 }
 
@@ -24,7 +22,9 @@ std::string TableInterface::table() const {
   return dash == std::string::npos ? name : name.substr(0, dash);
 }
 
-void TableInterface::init(Evt*) { nomTable(table()); }
+void TableInterface::init(Evt*) {
+  nomTable(table());
+}
 
 bool TableInterface::lireDans(const std::string& column, const Valeur& value) {
   Table main(this, nomBase(), table(), "LECTURE");

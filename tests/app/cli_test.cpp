@@ -28,8 +28,8 @@ class CliTest : public ::testing::Test {
 
   // Runs quarvo with `args`; stdout and stderr together.
   Result quarvo(const std::string& args) {
-    std::string cmd = std::string("QUARVO_DATA_DIR=") + QUARVO_SOURCE_DIR + "/db " +
-                      QUARVO_BINARY + " --db " + db_ + " " + args + " 2>&1";
+    std::string cmd = std::string("QUARVO_DATA_DIR=") + QUARVO_SOURCE_DIR + "/db " + QUARVO_BINARY +
+                      " --db " + db_ + " " + args + " 2>&1";
     FILE* p = popen(cmd.c_str(), "r");
     std::string out;
     std::array<char, 4096> buf{};
@@ -116,7 +116,8 @@ TEST_F(CliTest, RunPrintsResultsAndOutcome) {
 
 TEST_F(CliTest, CheckFindsAPlantedDriftAndFixRemovesIt) {
   ASSERT_EQ(quarvo("init --demo").code, 0);
-  std::string link = "sqlite3 " + db_ +
+  std::string link =
+      "sqlite3 " + db_ +
       " \"INSERT INTO QUARVO (IDENT, AFEBUD_IDENT, AFAFFA_IDENT, AFLBUD_IDENT, COMPOSANT, "
       "COMPOSANT_IDENT, PIECE, DATE_PIECE, QTE, HT) VALUES ('0000005001', '0000000201', "
       "'0000000011', '0000000211', 'GAPECOM', '0000000401', 'CF26000001', '2026-03-02', 1, "
@@ -124,7 +125,8 @@ TEST_F(CliTest, CheckFindsAPlantedDriftAndFixRemovesIt) {
   ASSERT_EQ(system(link.c_str()), 0);
   ASSERT_EQ(quarvo("recompute 0000000211").code, 0);
   EXPECT_EQ(quarvo("check").code, 0);
-  std::string drift = "sqlite3 " + db_ +
+  std::string drift =
+      "sqlite3 " + db_ +
       " \"UPDATE AFLBUD SET VENG = '260.00', VREA = '5.00;5.00;5.00' WHERE IDENT = '0000000211'\"";
   ASSERT_EQ(system(drift.c_str()), 0);
   Result found = quarvo("check");

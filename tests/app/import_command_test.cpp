@@ -62,8 +62,10 @@ TEST(ImportCommandTest, DemoFilesAreControlledThenImportedWithTheirErrorsListed)
   EXPECT_TRUE(fs::exists(o.ff));
 
   // Unattended, from the settings: the errors go to the day's report.
-  t.sql("UPDATE \"AFPARA\" SET \"PARAM2\" = '" + o.ff + "' WHERE \"CODE\" = 'IMPORT_06';"
-        "UPDATE \"AFPARA\" SET \"PARAM1\" = 'N' WHERE \"CODE\" IN ('IMPORT_03', 'IMPORT_04', 'IMPORT_05')");
+  t.sql("UPDATE \"AFPARA\" SET \"PARAM2\" = '" + o.ff +
+        "' WHERE \"CODE\" = 'IMPORT_06';"
+        "UPDATE \"AFPARA\" SET \"PARAM1\" = 'N' WHERE \"CODE\" IN ('IMPORT_03', 'IMPORT_04', "
+        "'IMPORT_05')");
   app::ImportOptions automatique;
   automatique.automatique = true;
   std::ostringstream report;

@@ -115,7 +115,9 @@ TEST(TableTest, DuplicateKeysAreRefusedAndTransactionsRollBackUnlessCommitted) {
 class RecordReader : public Traitmnt {
  public:
   explicit RecordReader(Evt* evt)
-      : Traitmnt(evt), record_(this, "VOVOVA", "I_AFLBUD", ""), cursor_(this, "GESCOM", "CHAINAGE", "CTX_CHAINAGE") {}
+      : Traitmnt(evt),
+        record_(this, "VOVOVA", "I_AFLBUD", ""),
+        cursor_(this, "GESCOM", "CHAINAGE", "CTX_CHAINAGE") {}
   Table record_;
   Table cursor_;
 };

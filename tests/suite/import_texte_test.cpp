@@ -14,7 +14,8 @@ using test::ecrireFichier;
 using test::requete;
 
 std::string erreurs(test::TestSession& t) {
-  return requete(t, R"(SELECT IDENT, COMPOSANT, CODE, DESIG, CMT FROM "IMM_ERREUR" ORDER BY IDENT)");
+  return requete(t,
+                 R"(SELECT IDENT, COMPOSANT, CODE, DESIG, CMT FROM "IMM_ERREUR" ORDER BY IDENT)");
 }
 
 TEST(ImportTexteTest, LoadsCrlfWindows1252AnyColumnOrderAndReplacesTheStagedFile) {
@@ -22,7 +23,8 @@ TEST(ImportTexteTest, LoadsCrlfWindows1252AnyColumnOrderAndReplacesTheStagedFile
   t.sql(R"(INSERT INTO "IMM_PIECE_CF" ("NUMERO_DOC") VALUES ('ANCIEN'))");
   // Windows-1252 "é" is 0xE9; a byte-order mark on an otherwise UTF-8 line is dropped.
   std::string file =
-      "\xEF\xBB\xBF" "DESIG\tnumero_doc\tQTE\tPUHT\tDATE_CREATION\tSOLDE\r\n"
+      "\xEF\xBB\xBF"
+      "DESIG\tnumero_doc\tQTE\tPUHT\tDATE_CREATION\tSOLDE\r\n"
       "Tube \"PER\"\tC1\t2,5\t1 0\t01/12/2026\t1\r\n";
   auto bad = ecrireFichier(t, "cf.txt", file);
   EXPECT_EQ(charger(t, "IMM_PIECE_CF", bad.string()), 1);  // "1 0" is no number
@@ -31,10 +33,11 @@ TEST(ImportTexteTest, LoadsCrlfWindows1252AnyColumnOrderAndReplacesTheStagedFile
             "0000000001|IMM_PIECE_CF|C1|Fichier cf.txt, ligne 2|colonne PUHT, valeur \"1 0\" : "
             "nombre attendu (virgule ou point décimal)\n");
 
-  file = "DESIG\tnumero_doc\tQTE\tPUHT\tDATE_CREATION\tSOLDE\r\n"
-         "Coude \xE9quip\xE9\tC1\t2,5\t180.50\t01/12/2026\t1\r\n"
-         "\r\n"
-         "\"Tube \"\"PER\"\"\"\tC2\t3\t 12,125 \t2026-11-30\t0\n";
+  file =
+      "DESIG\tnumero_doc\tQTE\tPUHT\tDATE_CREATION\tSOLDE\r\n"
+      "Coude \xE9quip\xE9\tC1\t2,5\t180.50\t01/12/2026\t1\r\n"
+      "\r\n"
+      "\"Tube \"\"PER\"\"\"\tC2\t3\t 12,125 \t2026-11-30\t0\n";
   auto good = ecrireFichier(t, "cf2.TXT", file);
   EXPECT_EQ(charger(t, "IMM_PIECE_CF", good.string()), 0);
   EXPECT_EQ(requete(t, R"(SELECT IDENT, NUMERO_DOC, DESIG, QTE, PUHT, DATE_CREATION, SOLDE,
@@ -90,9 +93,10 @@ TEST(ImportTexteTest, EveryFaultNamesFileLineColumnAndValueAndStagesNothing) {
             "Fichier vide.txt|fichier vide : la première ligne doit nommer les colonnes\n"
             "Fichier image.txt, ligne 2|contenu binaire (caractère de contrôle 0) : ce n'est pas "
             "un fichier texte\n"
-            "Fichier absent.txt|valeur \"" + (t.dir() / "absent.txt").string() +
+            "Fichier absent.txt|valeur \"" +
+                (t.dir() / "absent.txt").string() +
                 "\" : fichier introuvable\n"
-            "Fichier entete.txt|valeur \"QUARVO\" : table d'import inconnue\n");
+                "Fichier entete.txt|valeur \"QUARVO\" : table d'import inconnue\n");
   EXPECT_EQ(requete(t, R"(SELECT NUMERO_DOC FROM "IMM_PIECE_FF")"), "GARDE\n");
 }
 
@@ -101,8 +105,7 @@ TEST(ImportTexteTest, LongLinesAreRefusedAndBigFilesStream) {
   std::string file = "NUMERO_DOC\tDESIG\nF1\t" + std::string(70 * 1024, 'x') + "\nF2\tok\n";
   auto path = ecrireFichier(t, "long.txt", file);
   EXPECT_EQ(charger(t, "IMM_PIECE_DF", path.string()), 1);
-  EXPECT_EQ(requete(t, R"(SELECT CMT FROM "IMM_ERREUR")"),
-            "ligne de plus de 65536 caractères\n");
+  EXPECT_EQ(requete(t, R"(SELECT CMT FROM "IMM_ERREUR")"), "ligne de plus de 65536 caractères\n");
 
   std::ostringstream big;
   big << "NUMERO_DOC\tQTE\n";
@@ -126,7 +129,8 @@ TEST(ImportTexteTest, ErrorListIsShownAndSavedOrAppended) {
   test::TestSession t;
   host::EvtParamVal show{host::val(""), host::val("ach")};
   t.session().appelerProcedure("COMMUN", "IMPORT_CONSULTER_ERREURS", &show);
-  t.sql(R"(INSERT INTO "IMM_ERREUR" VALUES ('0000000001', 'IMM_PIECE_FF', 'F1', 'Facture fournisseur no F1',
+  t.sql(
+      R"(INSERT INTO "IMM_ERREUR" VALUES ('0000000001', 'IMM_PIECE_FF', 'F1', 'Facture fournisseur no F1',
              'Code fournisseur <X> inexistant'))");
   t.session().appelerProcedure("COMMUN", "IMPORT_CONSULTER_ERREURS", &show);
   EXPECT_EQ(t.ui().transcriptText(),
@@ -141,8 +145,9 @@ TEST(ImportTexteTest, ErrorListIsShownAndSavedOrAppended) {
   std::ifstream in(report);
   std::stringstream text;
   text << in.rdbuf();
-  std::string line = "0000000001\tIMM_PIECE_FF\tF1\tFacture fournisseur no F1\tCode fournisseur <X> "
-                     "inexistant\n";
+  std::string line =
+      "0000000001\tIMM_PIECE_FF\tF1\tFacture fournisseur no F1\tCode fournisseur <X> "
+      "inexistant\n";
   EXPECT_EQ(text.str(), "IDENT\tCOMPOSANT\tCODE\tDESIG\tCMT\n" + line + line);
 
   host::EvtParamVal unwritable{host::val((t.dir() / "rapports").string()), host::val("")};

@@ -32,7 +32,8 @@ TEST(ZumndocTest, NumbersStartAboveExistingRowsAndTakeEitherParameterOrder) {
   EXPECT_EQ(t.session().appelerProcedure("ZUMNDOC", "ATTRIBUE_NUMERO", &evt), 0);
   EXPECT_EQ(ident.text(), "0000000043");
   // A number never given out is not confirmed.
-  EvtParamVal bogus{val("VOVOVA"), val("NUMEROS"), val("QUARVO"), val(""), val(10), val("0000009999")};
+  EvtParamVal bogus{val("VOVOVA"), val("NUMEROS"), val("QUARVO"),
+                    val(""),       val(10),        val("0000009999")};
   EXPECT_EQ(t.session().appelerProcedure("ZUMNDOC", "VALIDE_NUMERO", &bogus), 1);
 }
 

@@ -10,7 +10,9 @@ namespace quarvo::test {
 
 using namespace host;
 
-std::filesystem::path sourceDir() { return QUARVO_SOURCE_DIR; }
+std::filesystem::path sourceDir() {
+  return QUARVO_SOURCE_DIR;
+}
 
 static std::string slurp(const std::filesystem::path& p) {
   std::ifstream in(p);

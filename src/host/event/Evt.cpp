@@ -38,7 +38,9 @@ static std::vector<Arg> copied(std::vector<Arg> args) {
 }
 
 EvtParamVal::EvtParamVal(std::initializer_list<Arg> args) : EvtParamVal(std::vector<Arg>(args)) {}
-EvtParamVal::EvtParamVal(std::vector<Arg> args) { args_ = copied(std::move(args)); }
+EvtParamVal::EvtParamVal(std::vector<Arg> args) {
+  args_ = copied(std::move(args));
+}
 
 EvtParamRef::EvtParamRef(std::initializer_list<Arg> args) : EvtParamRef(std::vector<Arg>(args)) {}
 EvtParamRef::EvtParamRef(std::vector<Arg> args) {

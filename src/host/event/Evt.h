@@ -88,10 +88,20 @@ class EvtParamRef : public Evt {
 };
 
 // Shorthands for building argument lists.
-inline Arg val(std::string s) { return Valeur::chaine(std::move(s)); }
-inline Arg val(const char* s) { return Valeur::chaine(s); }
-inline Arg val(int64_t n) { return Valeur::entier(n); }
-inline Arg val(int n) { return Valeur::entier(n); }
-inline Arg ref(Field& f) { return &f; }
+inline Arg val(std::string s) {
+  return Valeur::chaine(std::move(s));
+}
+inline Arg val(const char* s) {
+  return Valeur::chaine(s);
+}
+inline Arg val(int64_t n) {
+  return Valeur::entier(n);
+}
+inline Arg val(int n) {
+  return Valeur::entier(n);
+}
+inline Arg ref(Field& f) {
+  return &f;
+}
 
 }  // namespace quarvo::host

@@ -40,9 +40,17 @@ Date toDate(const Valeur& v) {
   return c ? c->asDate() : Date();
 }
 
-int64_t Field::entier() const { return toEntier(value_); }
-double Field::dbl() const { return toDouble(value_); }
-Monnaie Field::monnaie() const { return toMonnaie(value_); }
-Date Field::date() const { return toDate(value_); }
+int64_t Field::entier() const {
+  return toEntier(value_);
+}
+double Field::dbl() const {
+  return toDouble(value_);
+}
+Monnaie Field::monnaie() const {
+  return toMonnaie(value_);
+}
+Date Field::date() const {
+  return toDate(value_);
+}
 
 }  // namespace quarvo::host

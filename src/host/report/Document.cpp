@@ -9,7 +9,9 @@
 // Fontconfig keeps its font configuration for the life of the process (Pango's font map holds
 // it and is never released); the leak checker of sanitizer builds must not count it as ours.
 #if defined(__SANITIZE_ADDRESS__)
-extern "C" const char* __lsan_default_suppressions() { return "leak:libfontconfig\n"; }
+extern "C" const char* __lsan_default_suppressions() {
+  return "leak:libfontconfig\n";
+}
 #endif
 
 namespace quarvo::host::report {

@@ -47,8 +47,9 @@ std::string ScriptedDriver::transcriptText() const {
 int ScriptedDriver::boiteDialogue(const std::string& title, const std::string& text, int,
                                   const std::vector<std::string>& buttons) {
   auto answer = next();
-  int chosen = buttons.empty() ? 1 : answer ? answerIndex(*answer, buttons)
-                                            : static_cast<int>(buttons.size());
+  int chosen = buttons.empty() ? 1
+               : answer        ? answerIndex(*answer, buttons)
+                               : static_cast<int>(buttons.size());
   transcript_.push_back("MESSAGE " + title + " | " + text + " | " + joinButtons(buttons) +
                         (buttons.size() > 1 ? " -> " + std::to_string(chosen) : ""));
   return chosen;

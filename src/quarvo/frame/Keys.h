@@ -2,11 +2,11 @@
 //
 // Keys are texts joined with "|". A piece line's "NUMERO" starts with its header's "IDENT" and
 // "|"; a budget line's with its budget's. The link key "CLE_COMPO" is budget line, component
-// table and piece number; "CLE_COMPO2" is component table and component identifier, each followed by "|",
-// so all links of one piece are found by prefix whatever their budget line. (The database keeps
-// both keys in step with their columns whoever writes the row.) A chaining key "CLE_SRC" starts
-// with the source piece's type code and identifier, each followed by "|", so identifier 12 never
-// matches the rows of identifier 123.
+// table and piece number; "CLE_COMPO2" is component table and component identifier, each followed
+// by "|", so all links of one piece are found by prefix whatever their budget line. (The database
+// keeps both keys in step with their columns whoever writes the row.) A chaining key "CLE_SRC"
+// starts with the source piece's type code and identifier, each followed by "|", so identifier 12
+// never matches the rows of identifier 123.
 #pragma once
 
 #include <cstdint>

@@ -57,24 +57,23 @@ const Source sourceD("QUARVO", nullptr);
 // Unit E: import and settling.
 const Global globalE("COMMUN", "QUARVO");
 const Module importer("", "QUARVO-IMPORTER", &fabriquer<QUARVOImporter>, false, "");
-const Module importerAuto("", "QUARVO-IMPORTER_AUTO", &fabriquer<QUARVOImporter_auto>, false,
-                          "");
+const Module importerAuto("", "QUARVO-IMPORTER_AUTO", &fabriquer<QUARVOImporter_auto>, false, "");
 const Module importControlerBf("", "QUARVO-IMPORT_CONTROLER_BF",
-                                &fabriquer<QUARVOImport_controler_bf>, false, "");
+                               &fabriquer<QUARVOImport_controler_bf>, false, "");
 const Module importControlerCf("", "QUARVO-IMPORT_CONTROLER_CF",
-                                &fabriquer<QUARVOImport_controler_cf>, false, "");
+                               &fabriquer<QUARVOImport_controler_cf>, false, "");
 const Module importControlerDf("", "QUARVO-IMPORT_CONTROLER_DF",
-                                &fabriquer<QUARVOImport_controler_df>, false, "");
+                               &fabriquer<QUARVOImport_controler_df>, false, "");
 const Module importControlerFf("", "QUARVO-IMPORT_CONTROLER_FF",
-                                &fabriquer<QUARVOImport_controler_ff>, false, "");
-const Module importGenererBf("", "QUARVO-IMPORT_GENERER_BF",
-                              &fabriquer<QUARVOImport_generer_bf>, false, "");
-const Module importGenererCf("", "QUARVO-IMPORT_GENERER_CF",
-                              &fabriquer<QUARVOImport_generer_cf>, false, "");
-const Module importGenererDf("", "QUARVO-IMPORT_GENERER_DF",
-                              &fabriquer<QUARVOImport_generer_df>, false, "");
-const Module importGenererFf("", "QUARVO-IMPORT_GENERER_FF",
-                              &fabriquer<QUARVOImport_generer_ff>, false, "");
+                               &fabriquer<QUARVOImport_controler_ff>, false, "");
+const Module importGenererBf("", "QUARVO-IMPORT_GENERER_BF", &fabriquer<QUARVOImport_generer_bf>,
+                             false, "");
+const Module importGenererCf("", "QUARVO-IMPORT_GENERER_CF", &fabriquer<QUARVOImport_generer_cf>,
+                             false, "");
+const Module importGenererDf("", "QUARVO-IMPORT_GENERER_DF", &fabriquer<QUARVOImport_generer_df>,
+                             false, "");
+const Module importGenererFf("", "QUARVO-IMPORT_GENERER_FF", &fabriquer<QUARVOImport_generer_ff>,
+                             false, "");
 const Module solder("", "QUARVO-SOLDER", &fabriquer<QUARVOSolder>, false, "");
 const Source sourceE("QUARVO", nullptr);
 

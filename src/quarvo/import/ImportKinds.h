@@ -9,14 +9,14 @@
 namespace quarvo::import {
 
 struct SorteImport {
-  const char* code;         // "DF"
-  const char* parametre;    // "IMPORT_03"
-  const char* champ;        // "V_FICHIER_DF"
-  const char* bouton;       // "V_FICHIER_DF_CHOISIR"
-  const char* erreur;       // "V_ERREUR_DF"
-  const char* staging;      // "IMM_PIECE_DF"
-  const char* controle;     // "QUARVO-IMPORT_CONTROLER_DF"
-  const char* generation;   // "QUARVO-IMPORT_GENERER_DF"
+  const char* code;        // "DF"
+  const char* parametre;   // "IMPORT_03"
+  const char* champ;       // "V_FICHIER_DF"
+  const char* bouton;      // "V_FICHIER_DF_CHOISIR"
+  const char* erreur;      // "V_ERREUR_DF"
+  const char* staging;     // "IMM_PIECE_DF"
+  const char* controle;    // "QUARVO-IMPORT_CONTROLER_DF"
+  const char* generation;  // "QUARVO-IMPORT_GENERER_DF"
   const char* messageExtension;
   const char* messageAbsent;
 };

@@ -34,8 +34,8 @@ QUARVOImport_controler::QUARVOImport_controler(Evt* evt, const DifferencesContro
       iGcpfour_(this, "GESCOM", "I_GCPFOUR", "") {
   if (kind_.budget) afebud_ = std::make_unique<Table>(this, "VOVOVA", "AFEBUD", "");
   if (kind_.avoirs) {
-    staging2_ = std::make_unique<Table>(this, "VOVOVA", kind_.staging,
-                                        std::string(kind_.staging) + "2");
+    staging2_ =
+        std::make_unique<Table>(this, "VOVOVA", kind_.staging, std::string(kind_.staging) + "2");
   }
   lierParametres(evt, {{&pErreur_, 1}});
   nomBase("VOVOVA");
@@ -48,7 +48,6 @@ QUARVOImport_controler::QUARVOImport_controler(Evt* evt, const DifferencesContro
 }
 
 QUARVOImport_controler::~QUARVOImport_controler() = default;
-
 
 std::string QUARVOImport_controler::staged(const char* column) {
   return courant().valeur(column).toChaine();
@@ -124,9 +123,14 @@ void QUARVOImport_controler::pour_tout(Evt*) {
   // 4. Project section.
   pMessage1_.set("");
   pMessage2_.set("");
-  EvtParamRef secan{val(kind_.staging), val(pieceCourante_),
-                    Arg(row.valeur("DATE_CREATION")), val(staged("AFFAIRE")),
-                    val("1"), val(""), ref(pMessage1_), ref(pMessage2_)};
+  EvtParamRef secan{val(kind_.staging),
+                    val(pieceCourante_),
+                    Arg(row.valeur("DATE_CREATION")),
+                    val(staged("AFFAIRE")),
+                    val("1"),
+                    val(""),
+                    ref(pMessage1_),
+                    ref(pMessage2_)};
   appelerProcedure("*", "AFAFFA", "INTERFACE", "CONTROLER_SECAN", &secan, -1);
   if (erreurMethode() != 0) erreur(pMessage2_.text());
 
@@ -157,7 +161,8 @@ void QUARVOImport_controler::pour_tout(Evt*) {
       appelerProcedure("*", "AFPARA", "INTERFACE", "REGROUPEMENT_ACHAT", &regroupement, -1);
       EvtParamVal pres{Arg(vPrestationIdent_.value())};
       appelerProcedure("*1", "AFPRES", "INTERFACE", "LECTURE", &pres, -1);
-      if (erreurMethode() != 0) erreur("Code article <" + article + "> : lien prestation inexistant");
+      if (erreurMethode() != 0)
+        erreur("Code article <" + article + "> : lien prestation inexistant");
     }
     Valeur taux = row.valeur("TAUX_TVA");
     gcptxtva_.effacerCriteres();

@@ -27,19 +27,19 @@
 namespace quarvo {
 
 struct DifferencesControle {
-  const char* code;      // "DF", "CF", "BF", "FF"
-  const char* staging;   // staging table, also the "COMPOSANT" of its error rows
-  const char* prefixe;   // "DESIG" of an error row, before the piece number
-  bool budget;           // the budget code is checked
-  bool avoirs;           // invalid invoice lines get their credit-note line staged
+  const char* code;     // "DF", "CF", "BF", "FF"
+  const char* staging;  // staging table, also the "COMPOSANT" of its error rows
+  const char* prefixe;  // "DESIG" of an error row, before the piece number
+  bool budget;          // the budget code is checked
+  bool avoirs;          // invalid invoice lines get their credit-note line staged
 };
 
 inline constexpr DifferencesControle kControleDf{"DF", "IMM_PIECE_DF", "Devis fournisseur no ",
                                                  false, false};
-inline constexpr DifferencesControle kControleCf{"CF", "IMM_PIECE_CF",
-                                                 "Commande fournisseur no ", true, false};
-inline constexpr DifferencesControle kControleBf{"BF", "IMM_PIECE_BF", "Bon de réception no ",
+inline constexpr DifferencesControle kControleCf{"CF", "IMM_PIECE_CF", "Commande fournisseur no ",
                                                  true, false};
+inline constexpr DifferencesControle kControleBf{"BF", "IMM_PIECE_BF", "Bon de réception no ", true,
+                                                 false};
 inline constexpr DifferencesControle kControleFf{"FF", "IMM_PIECE_FF", "Facture fournisseur no ",
                                                  true, true};
 

@@ -29,8 +29,8 @@ QUARVOImporter_auto::QUARVOImporter_auto(Evt* evt)
 
 fs::path QUARVOImporter_auto::cheminRapport(const std::string& company, const Date& day) {
   std::string date = day.text();  // dd/mm/yyyy
-  std::string compact = date.size() == 10 ? date.substr(0, 2) + date.substr(3, 2) + date.substr(6)
-                                          : std::string();
+  std::string compact =
+      date.size() == 10 ? date.substr(0, 2) + date.substr(3, 2) + date.substr(6) : std::string();
   return Table::repSGBD() / "VOVOVA" / (company + ".$so") / "rapports" /
          ("ierreurs_ach_" + compact + ".txt");
 }

@@ -131,8 +131,7 @@ void QUARVOSolder::supprimer_lots_inutiles(Evt* evt) {
 void QUARVOSolder::traite_entete(Evt*) {
   Valeur type = typePiece_.value();
   Valeur ident = entetes_->valeur("IDENT");
-  bool toutReporte =
-      Valeur::compare(entetes_->valeur("QTT"), entetes_->valeur("QTNT")) == 0;
+  bool toutReporte = Valeur::compare(entetes_->valeur("QTT"), entetes_->valeur("QTNT")) == 0;
   service("GCPFOUR", "SOLDE_PIECE",
           {Arg(type), Arg(ident), Arg(entetes_->valeur(toutReporte ? "HT" : "MTNT_HT")),
            Arg(entetes_->valeur(toutReporte ? "TTC" : "MTNT_TTC"))});

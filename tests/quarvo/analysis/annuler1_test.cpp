@@ -14,10 +14,12 @@ class Annuler1Test : public ::testing::Test {
   Annuler1Test() : t_(true) {}
   void link(const std::string& ident, const std::string& line, const std::string& kind,
             const std::string& piece, const std::string& ht) {
-    t_.sql("INSERT INTO \"QUARVO\" (\"IDENT\", \"AFEBUD_IDENT\", \"AFAFFA_IDENT\", \"AFLBUD_IDENT\", "
-           "\"COMPOSANT\", \"COMPOSANT_IDENT\", \"PIECE\", \"DATE_PIECE\", \"QTE\", \"HT\") VALUES ('" +
-           ident + "', '0000000201', '0000000011', '" + line + "', '" + kind + "', '" + piece +
-           "', 'N" + piece + "', '2026-05-12', 1, '" + ht + "')");
+    t_.sql(
+        "INSERT INTO \"QUARVO\" (\"IDENT\", \"AFEBUD_IDENT\", \"AFAFFA_IDENT\", \"AFLBUD_IDENT\", "
+        "\"COMPOSANT\", \"COMPOSANT_IDENT\", \"PIECE\", \"DATE_PIECE\", \"QTE\", \"HT\") VALUES "
+        "('" +
+        ident + "', '0000000201', '0000000011', '" + line + "', '" + kind + "', '" + piece +
+        "', 'N" + piece + "', '2026-05-12', 1, '" + ht + "')");
   }
   void validate(const std::string& line) {
     EvtParamVal evt{val(line)};
@@ -35,7 +37,8 @@ TEST_F(Annuler1Test, PieceOnTwoLinesLeavesBothAndOnlyItsOwnAmounts) {
   link("0000005001", "0000000211", "GAPECOM", "0000000401", "100.00");
   link("0000005002", "0000000212", "GAPECOM", "0000000401", "40.00");
   link("0000005003", "0000000211", "GAPECOM", "0000000402", "7.50");  // another piece stays
-  t_.sql("INSERT INTO \"AFPFST\" (\"IDENT\", \"QUARVO_IDENT\") VALUES ('0000000001', '0000005002')");
+  t_.sql(
+      "INSERT INTO \"AFPFST\" (\"IDENT\", \"QUARVO_IDENT\") VALUES ('0000000001', '0000005002')");
   validate("0000000211");
   validate("0000000212");
   ASSERT_EQ(veng("0000000211"), "107.50");

@@ -68,8 +68,12 @@ inline const char* kEnteteFichier =
     "NUMERO_DOC\tDATE_CREATION\tFOURNISSEUR\tAFFAIRE\tBUDGET\tARTICLE\tDESIG\tQTE\tPUHT\t"
     "TAUX_REMISE\tTAUX_TVA\tREFERENCE\tORIGINE\tDEMANDEUR";
 // The invoice file's header line.
-inline std::string enteteFf() { return std::string(kEnteteFichier) + "\tNUMERO\tTYPE\tVALIDE\n"; }
+inline std::string enteteFf() {
+  return std::string(kEnteteFichier) + "\tNUMERO\tTYPE\tVALIDE\n";
+}
 // The header line of quote requests, orders and receipts.
-inline std::string enteteAutre() { return std::string(kEnteteFichier) + "\tSOLDE\n"; }
+inline std::string enteteAutre() {
+  return std::string(kEnteteFichier) + "\tSOLDE\n";
+}
 
 }  // namespace quarvo::test

@@ -12,16 +12,18 @@ using test::requete;
 
 TEST(ImportControlerTest, EveryFaultOfEveryRowIsWrittenAndRefusedPiecesLeaveTheStaging) {
   test::TestSession t(true);
-  t.sql(R"(INSERT INTO "IMM_ERREUR" ("IDENT", "COMPOSANT", "CODE") VALUES ('0000000007', 'GAPEFAC', 'X');
+  t.sql(
+      R"(INSERT INTO "IMM_ERREUR" ("IDENT", "COMPOSANT", "CODE") VALUES ('0000000007', 'GAPEFAC', 'X');
            INSERT INTO "GCPARTIC" ("IDENT", "CODE", "DESIG", "GCPCRIT1_IDENT")
            VALUES ('0000000088', 'SANS-LIEN', 'Article sans regroupement', '0000000099'))");
-  std::string file = test::enteteFf() +
+  std::string file =
+      test::enteteFf() +
       // a sound line, dated the last day of the company's month, and a comment line whose
       // VAT rate the regime lacks
       ligne({"FA26000001", "31/12/2026", "ELECDIS", "AFF001", "BU26-0001", "CABLE-3G2.5", "", "2",
              "180", "0", "20", "R1", "", "TECH01", "E-1", "F", "1"}) +
-      ligne({"FA26000001", "31/12/2026", "ELECDIS", "AFF001", "", "", "Commentaire", "0", "0",
-             "0", "7", "R1", "", "", "E-1", "F", "1"}) +
+      ligne({"FA26000001", "31/12/2026", "ELECDIS", "AFF001", "", "", "Commentaire", "0", "0", "0",
+             "7", "R1", "", "", "E-1", "F", "1"}) +
       // every fault at once, then a sound line of the same piece
       ligne({"FA26000002", "01/01/2027", "INCONNU", "AFF001", "BU-XX", "ARTX", "", "1", "10", "0",
              "19,6", "R2", "", "", "E-2", "F", "0"}) +
@@ -84,9 +86,9 @@ TEST(ImportControlerTest, QuotesIgnoreBudgetsAndEarlierErrorsDoNotRefuseACorrect
   // An error of an earlier run names piece DF1: the corrected file must still go through.
   t.sql(R"(INSERT INTO "IMM_ERREUR" VALUES ('0000000003', 'IMM_PIECE_DF', 'DF1',
              'Devis fournisseur no DF1', 'Code fournisseur <X> inexistant'))");
-  std::string file = test::enteteAutre() +
-                     ligne({"DF1", "01/12/2026", "ELECDIS", "AFF001", "PAS-UN-BUDGET",
-                            "CABLE-3G2.5", "", "1", "180", "0", "20", "", "", "", "0"});
+  std::string file =
+      test::enteteAutre() + ligne({"DF1", "01/12/2026", "ELECDIS", "AFF001", "PAS-UN-BUDGET",
+                                   "CABLE-3G2.5", "", "1", "180", "0", "20", "", "", "", "0"});
   auto path = test::ecrireFichier(t, "df.txt", file);
   ASSERT_EQ(charger(t, "IMM_PIECE_DF", path.string()), 0);
   EXPECT_EQ(lancer(t, "IMPORT_CONTROLER_DF"), 0);
@@ -94,9 +96,9 @@ TEST(ImportControlerTest, QuotesIgnoreBudgetsAndEarlierErrorsDoNotRefuseACorrect
   EXPECT_EQ(requete(t, R"(SELECT COUNT(*) FROM "IMM_ERREUR")"), "1\n");
 
   // The same budget code in an order file is refused.
-  std::string order = test::enteteAutre() +
-                      ligne({"CF1", "01/12/2026", "ELECDIS", "AFF001", "PAS-UN-BUDGET",
-                             "CABLE-3G2.5", "", "1", "180", "0", "20", "", "", "", "0"});
+  std::string order =
+      test::enteteAutre() + ligne({"CF1", "01/12/2026", "ELECDIS", "AFF001", "PAS-UN-BUDGET",
+                                   "CABLE-3G2.5", "", "1", "180", "0", "20", "", "", "", "0"});
   auto orderPath = test::ecrireFichier(t, "cf.txt", order);
   ASSERT_EQ(charger(t, "IMM_PIECE_CF", orderPath.string()), 0);
   EXPECT_EQ(lancer(t, "IMPORT_CONTROLER_CF"), 1);

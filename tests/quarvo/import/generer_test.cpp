@@ -32,8 +32,8 @@ std::string factures() {
          ligne({"FA26000001", "15/12/2026", "ELECDIS", "AFF001", "BU26-0001", "TABLEAU-ELEC",
                 "Tableau posé", "1", "350", "10", "20", "Câblage", "BR1", "TECH01", "EDC-77", "F",
                 "1"}) +
-         ligne({"FA26000001", "15/12/2026", "ELECDIS", "AFF001", "", "", "Livré le 14/12", "0",
-                "0", "0", "0", "Câblage", "BR1", "TECH01", "EDC-77", "F", "1"}) +
+         ligne({"FA26000001", "15/12/2026", "ELECDIS", "AFF001", "", "", "Livré le 14/12", "0", "0",
+                "0", "0", "Câblage", "BR1", "TECH01", "EDC-77", "F", "1"}) +
          ligne({"AV26000002", "16/12/2026", "ELECDIS", "AFF001", "BU26-0001", "CABLE-3G2.5", "",
                 "1", "180", "0", "20", "Retour", "", "", "EDC-A-9", "A", "1"});
 }
@@ -67,8 +67,9 @@ TEST(ImportGenererTest, InvoicesAndCreditNotesAreCreatedBookedAndLinkedOnce) {
             "0000000211|GAPEFAC|AV26000002\n"
             "0000000201|AFF001|0000000211|GAPEFAC|0000001002|FA26000001|2026-12-15|3.0|710.00|"
             "0000000211|GAPEFAC|FA26000001\n");
-  EXPECT_EQ(requete(t, R"(SELECT VREA, VRAF, round(AVT, 4) FROM "AFLBUD" WHERE IDENT = '0000000211')"),
-            "530.00;530.00;530.00|5470.00;5470.00;5470.00|8.8333\n");
+  EXPECT_EQ(
+      requete(t, R"(SELECT VREA, VRAF, round(AVT, 4) FROM "AFLBUD" WHERE IDENT = '0000000211')"),
+      "530.00;530.00;530.00|5470.00;5470.00;5470.00|8.8333\n");
   EXPECT_EQ(requete(t, R"(SELECT GAPEFAC_IDENT, NUMERO_DOC, DATE_ECHEANCE, MONTANT FROM "GAPECH"
                            WHERE IDENT > '0000001000' ORDER BY GAPEFAC_IDENT)"),
             "0000001001|AV26000002|2027-01-31|216.00\n"
@@ -87,17 +88,16 @@ TEST(ImportGenererTest, InvoicesAndCreditNotesAreCreatedBookedAndLinkedOnce) {
   EXPECT_EQ(t.ui().transcriptText().find("MESSAGE"), std::string::npos);
 }
 
-
 TEST(ImportGenererTest, RealisedBeyondBudgetAndNewBudgetLines) {
   test::TestSession t(true);
   std::string file =
       test::enteteFf() +
       // 11 days at 180.00 on a line budgeted 1 800.00: nothing remains, progress is 100 %.
-      ligne({"FA26100009", "10/12/2026", "LOCAPRO", "AFF001", "BU26-0001", "NACELLE-JOUR", "",
-             "11", "180", "0", "20", "", "", "", "", "F", "1"}) +
+      ligne({"FA26100009", "10/12/2026", "LOCAPRO", "AFF001", "BU26-0001", "NACELLE-JOUR", "", "11",
+             "180", "0", "20", "", "", "", "", "F", "1"}) +
       // A service the budget lacks: a line is created, budgeted 0, with progress 0.
-      ligne({"FA26100010", "10/12/2026", "ELECDIS", "AFF001", "BU26-0001", "ETUDE-THERM", "",
-             "1", "4000", "0", "20", "", "", "", "", "F", "1"});
+      ligne({"FA26100010", "10/12/2026", "ELECDIS", "AFF001", "BU26-0001", "ETUDE-THERM", "", "1",
+             "4000", "0", "20", "", "", "", "", "F", "1"});
   EXPECT_EQ(importer(t, "FF", file), 0);
   EXPECT_EQ(requete(t, R"(SELECT IDENT, NUMERO, AFEBUD_IDENT, DESIG, AFPRES_CODE, UNITE, APPRO,
                                 AFEBUD_PIECE, DATE_DEBUT, VBUD_D, VREA, VRAF, AVT
@@ -134,16 +134,18 @@ TEST(ImportGenererTest, OrdersReceiptsAndQuotesBookSettleAndCreateTheirRequester
   EXPECT_EQ(requete(t, R"(SELECT QTE, QTE_SOLDEE FROM "GAPLCOM" WHERE IDENT > '0000001000'
                            ORDER BY IDENT)"),
             "5.0|5.0\n2.0|0.0\n");
-  EXPECT_EQ(requete(t, R"(SELECT QTE_ATTENDUE FROM "GCPSTOCK" WHERE IDENT = '0000000196')"), "15.0\n");
-  EXPECT_EQ(requete(t, R"(SELECT IDENT, VENG FROM "AFLBUD" WHERE IDENT IN ('0000000211', '0000000212')
+  EXPECT_EQ(requete(t, R"(SELECT QTE_ATTENDUE FROM "GCPSTOCK" WHERE IDENT = '0000000196')"),
+            "15.0\n");
+  EXPECT_EQ(
+      requete(t, R"(SELECT IDENT, VENG FROM "AFLBUD" WHERE IDENT IN ('0000000211', '0000000212')
                            ORDER BY IDENT)"),
-            "0000000211|360.00\n0000000212|62.50\n");
+      "0000000211|360.00\n0000000212|62.50\n");
   EXPECT_EQ(requete(t, R"(SELECT AFPOST_CODE, ANNEE_MOIS, VENG FROM "AFRESU" ORDER BY ANNEE_MOIS)"),
             "ACH-MAT|202612|422.50\n");
 
-  std::string receptions = test::enteteAutre() +
-                           ligne({"BR26100001", "07/12/2026", "LOCAPRO", "AFF001", "BU26-0001",
-                                  "NACELLE-JOUR", "", "2", "180", "0", "20", "", "", "", "0"});
+  std::string receptions =
+      test::enteteAutre() + ligne({"BR26100001", "07/12/2026", "LOCAPRO", "AFF001", "BU26-0001",
+                                   "NACELLE-JOUR", "", "2", "180", "0", "20", "", "", "", "0"});
   EXPECT_EQ(importer(t, "BF", receptions), 0);
   EXPECT_EQ(requete(t, R"(SELECT AFLBUD_IDENT, COMPOSANT, PIECE, QTE, HT FROM "QUARVO"
                            WHERE COMPOSANT = 'GAPEBL')"),
@@ -152,14 +154,15 @@ TEST(ImportGenererTest, OrdersReceiptsAndQuotesBookSettleAndCreateTheirRequester
             "0.00|0.00;0.00;0.00\n");
 
   // A quote request is settled on every run, also when it already exists.
-  std::string demandes = test::enteteAutre() +
-                         ligne({"DF26100001", "07/09/2026", "LOCAPRO", "AFF003", "", "NACELLE-JOUR",
-                                "", "2", "180", "0", "20", "", "", "", "1"});
+  std::string demandes =
+      test::enteteAutre() + ligne({"DF26100001", "07/09/2026", "LOCAPRO", "AFF003", "",
+                                   "NACELLE-JOUR", "", "2", "180", "0", "20", "", "", "", "1"});
   EXPECT_EQ(importer(t, "DF", demandes), 0);
   t.sql(R"(UPDATE "GAPEDEV" SET "SOLDEE" = 0 WHERE "NUMERO_DOC" = 'DF26100001')");
   EXPECT_EQ(importer(t, "DF", demandes), 0);
-  EXPECT_EQ(requete(t, R"(SELECT NUMERO_DOC, SOLDEE, VALIDEE FROM "GAPEDEV" WHERE IDENT > '0000001000')"),
-            "DF26100001|1|1\n");
+  EXPECT_EQ(
+      requete(t, R"(SELECT NUMERO_DOC, SOLDEE, VALIDEE FROM "GAPEDEV" WHERE IDENT > '0000001000')"),
+      "DF26100001|1|1\n");
   EXPECT_EQ(requete(t, R"(SELECT COUNT(*) FROM "QUARVO" WHERE COMPOSANT = 'GAPEDEV')"), "0\n");
   EXPECT_EQ(t.ui().transcriptText().find("MESSAGE"), std::string::npos);
 }
@@ -194,7 +197,8 @@ TEST(ImportGenererTest, APieceThePurchasingModuleRefusesIsNotWrittenAtAll) {
 
 // What a run leaves behind, without the times of day.
 std::string etat(test::TestSession& t) {
-  return requete(t, R"(SELECT IDENT, NUMERO_DOC, SOLDEE, VALIDEE, BRUT, HT, TTC, QTNT, GAPAPPOR_IDENT
+  return requete(t,
+                 R"(SELECT IDENT, NUMERO_DOC, SOLDEE, VALIDEE, BRUT, HT, TTC, QTNT, GAPAPPOR_IDENT
                          FROM "GAPECOM" ORDER BY IDENT)") +
          requete(t, R"(SELECT IDENT, NUMERO, GCPARTIC_CODE, QTE, QTE_SOLDEE, HT FROM "GAPLCOM"
                          ORDER BY IDENT)") +

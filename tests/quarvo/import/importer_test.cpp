@@ -31,11 +31,14 @@ std::string facturesDontUneRefusee() {
 // Settings of the four kinds: the default files in the test's folder; CF switched off.
 void reglages(test::TestSession& t) {
   auto d = t.dir().string();
-  t.sql("UPDATE \"AFPARA\" SET \"PARAM2\" = '" + d + "/df.Txt' WHERE \"CODE\" = 'IMPORT_03';"
-        "UPDATE \"AFPARA\" SET \"PARAM1\" = 'N', \"PARAM2\" = '" + d +
+  t.sql("UPDATE \"AFPARA\" SET \"PARAM2\" = '" + d +
+        "/df.Txt' WHERE \"CODE\" = 'IMPORT_03';"
+        "UPDATE \"AFPARA\" SET \"PARAM1\" = 'N', \"PARAM2\" = '" +
+        d +
         "/cf.txt' WHERE \"CODE\" = 'IMPORT_04';"
         "UPDATE \"AFPARA\" SET \"PARAM2\" = '' WHERE \"CODE\" = 'IMPORT_05';"
-        "UPDATE \"AFPARA\" SET \"PARAM2\" = '" + d + "/ff.txt' WHERE \"CODE\" = 'IMPORT_06';");
+        "UPDATE \"AFPARA\" SET \"PARAM2\" = '" +
+        d + "/ff.txt' WHERE \"CODE\" = 'IMPORT_06';");
 }
 
 host::Automate& ouvrir(test::TestSession& t) {
@@ -69,8 +72,9 @@ TEST(ImporterTest, RefusedValidationsImportNothingAndKeepTheWindowOpen) {
   EXPECT_EQ(w.champ("V_FICHIER_DF")->text(), (t.dir() / "autre.txt").string());
   EXPECT_EQ(w.champ("V_DOSSIER")->text(), (t.dir() / "df.Txt").string());
   w.raise("V_FICHIER_CF_CHOISIR", &none);
-  EXPECT_EQ(t.ui().transcriptText(), "FICHIER Sélection d'un fichier (Tous les fichiers (*.*)|*.*) -> " +
-                                         (t.dir() / "autre.txt").string() + "\n");
+  EXPECT_EQ(t.ui().transcriptText(),
+            "FICHIER Sélection d'un fichier (Tous les fichiers (*.*)|*.*) -> " +
+                (t.dir() / "autre.txt").string() + "\n");
   t.ui().clear();
   w.champ("V_FICHIER_DF")->set((t.dir() / "df.Txt").string());
 
@@ -142,11 +146,17 @@ TEST(ImporterTest, ControlOnlyKeepsFilesAndImportDeletesOnlyCleanOnes) {
   std::string premiere =
       "0000000001  IMM_PIECE_FF  FA26200002  Facture fournisseur no FA26200002  Code fournisseur "
       "<NOBODY> inexistant";
-  EXPECT_EQ(messages,
-            "MESSAGE Information | [114] Contrôle terminé : des erreurs ont été trouvées. Consultez la liste des erreurs.\n"
-            "MESSAGE Liste des erreurs d'import | " + premiere + "\n"
-            "MESSAGE Information | [112] Import terminé avec des erreurs : les pièces en erreur n'ont pas été créées et leurs fichiers sont conservés. Consultez la liste des erreurs.\n"
-            "MESSAGE Liste des erreurs d'import | " + premiere + "\n");
+  EXPECT_EQ(
+      messages,
+      "MESSAGE Information | [114] Contrôle terminé : des erreurs ont été trouvées. Consultez la "
+      "liste des erreurs.\n"
+      "MESSAGE Liste des erreurs d'import | " +
+          premiere +
+          "\n"
+          "MESSAGE Information | [112] Import terminé avec des erreurs : les pièces en erreur "
+          "n'ont pas été créées et leurs fichiers sont conservés. Consultez la liste des erreurs.\n"
+          "MESSAGE Liste des erreurs d'import | " +
+          premiere + "\n");
   EXPECT_NE(transcript.find("Code fournisseur <NOBODY> inexistant"), std::string::npos);
 }
 
@@ -164,7 +174,8 @@ TEST(ImporterAutoTest, ImportsAllowedKindsAndEmptiesTheErrorsOnceReported) {
   test::ecrireFichier(t, "cf.txt", devisSain());  // switched off: never imported
   test::ecrireFichier(t, "ff.txt", facturesDontUneRefusee());
   // An error left by an earlier window import goes into this report.
-  t.sql(R"(INSERT INTO "IMM_ERREUR" VALUES ('0000000001', 'IMM_PIECE_BF', 'BR9', 'Bon de réception no BR9', 'ancienne'))");
+  t.sql(
+      R"(INSERT INTO "IMM_ERREUR" VALUES ('0000000001', 'IMM_PIECE_BF', 'BR9', 'Bon de réception no BR9', 'ancienne'))");
   // The report's folder cannot be made at first: the errors must stay.
   test::ecrireFichier(t, "VOVOVA", "not a folder");
   host::EvtParamVal none;

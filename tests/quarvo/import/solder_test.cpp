@@ -20,11 +20,14 @@ TEST(SolderTest, AnOrderSettlesItsOpenLinesLotsStockAndHeader) {
   EXPECT_EQ(requete(t, R"(SELECT IDENT, QTE, QTT, QTE_SOLDEE FROM "GAPLCOM"
                            WHERE NUMERO LIKE '0000000402|%' ORDER BY IDENT)"),
             "0000000413|10.0|10.0|0.0\n0000000414|20.0|0.0|20.0\n");
-  EXPECT_EQ(requete(t, R"(SELECT QTE_ATTENDUE FROM "GCPSTOCK" WHERE IDENT = '0000000196')"), "0.0\n");
+  EXPECT_EQ(requete(t, R"(SELECT QTE_ATTENDUE FROM "GCPSTOCK" WHERE IDENT = '0000000196')"),
+            "0.0\n");
   EXPECT_EQ(requete(t, R"(SELECT SOLDE FROM "GAPLOT" WHERE IDENT = '0000000881')"), "1\n");
   // Not everything was carried forward: the piece is settled for what was.
-  EXPECT_EQ(requete(t, R"(SELECT SOLDEE, QTNT, MTNT_HT, MTNT_TTC FROM "GAPECOM" WHERE IDENT = '0000000402')"),
-            "1|0.0|950.00|1140.00\n");
+  EXPECT_EQ(
+      requete(
+          t, R"(SELECT SOLDEE, QTNT, MTNT_HT, MTNT_TTC FROM "GAPECOM" WHERE IDENT = '0000000402')"),
+      "1|0.0|950.00|1140.00\n");
 }
 
 TEST(SolderTest, ReceiptsNeverTouchLotsAndOtherTablesOrPiecesFail) {
@@ -41,13 +44,16 @@ TEST(SolderTest, ReceiptsNeverTouchLotsAndOtherTablesOrPiecesFail) {
             "1|950.00\n");
   // All carried forward (QTT = QTNT = 0): settled for its full amounts.
   EXPECT_EQ(solder(t, "GAPEDEV", "0000000302"), 0);
-  EXPECT_EQ(requete(t, R"(SELECT SOLDEE, MTNT_HT, MTNT_TTC FROM "GAPEDEV" WHERE IDENT = '0000000302')"),
-            "1|10.00|12.00\n");
+  EXPECT_EQ(
+      requete(t, R"(SELECT SOLDEE, MTNT_HT, MTNT_TTC FROM "GAPEDEV" WHERE IDENT = '0000000302')"),
+      "1|10.00|12.00\n");
 
-  std::string before = requete(t, R"(SELECT * FROM "GAPEFAC")") + requete(t, R"(SELECT * FROM "GAPLCOM")");
+  std::string before =
+      requete(t, R"(SELECT * FROM "GAPEFAC")") + requete(t, R"(SELECT * FROM "GAPLCOM")");
   EXPECT_EQ(solder(t, "GAPEFAC", "0000000601"), 1);
   EXPECT_EQ(solder(t, "GAPECOM", "0000009999"), 1);
-  EXPECT_EQ(requete(t, R"(SELECT * FROM "GAPEFAC")") + requete(t, R"(SELECT * FROM "GAPLCOM")"), before);
+  EXPECT_EQ(requete(t, R"(SELECT * FROM "GAPEFAC")") + requete(t, R"(SELECT * FROM "GAPLCOM")"),
+            before);
   EXPECT_EQ(t.ui().transcriptText(), "");
 }
 

@@ -21,7 +21,8 @@ class ImputationTest : public ::testing::Test {
   void point(const std::string& kind, int arbitration = 0, const std::string& min = "",
              const std::string& max = "", const std::string& project = "") {
     for (const char* work : {"M_EAPPR", "M_LAPPR", "M_VAPPR"}) t_.session().memoire(work).clear();
-    EvtParamVal evt{val(""), val("31/12/2026"), val(kind), val(arbitration), val(min), val(max), val(project)};
+    EvtParamVal evt{val(""),  val("31/12/2026"), val(kind),   val(arbitration),
+                    val(min), val(max),          val(project)};
     t_.session().appelerModule("QUARVO-POINTER_PIECES", &evt);
   }
   void write() { t_.session().appelerModule("QUARVO-IMPUTER_PIECES", nullptr); }
@@ -120,9 +121,11 @@ TEST_F(ImputationTest, UnitPricesQuantitiesAndCreditNotes) {
 
 TEST_F(ImputationTest, TwoSuitableLinesNeedArbitrationAndArbitrationCreatesMissingLines) {
   // A second line of budget 201 for the same service as line 211.
-  t_.sql("INSERT INTO \"AFLBUD\" (\"IDENT\", \"NUMERO\", \"AFEBUD_IDENT\", \"AFAFFA_IDENT\", "
-         "\"AFPRES_IDENT\", \"VBUD_D\") SELECT '0000000219', '0000000201|9', '0000000201', "
-         "\"AFAFFA_IDENT\", \"AFPRES_IDENT\", '100.00' FROM \"AFLBUD\" WHERE \"IDENT\" = '0000000211'");
+  t_.sql(
+      "INSERT INTO \"AFLBUD\" (\"IDENT\", \"NUMERO\", \"AFEBUD_IDENT\", \"AFAFFA_IDENT\", "
+      "\"AFPRES_IDENT\", \"VBUD_D\") SELECT '0000000219', '0000000201|9', '0000000201', "
+      "\"AFAFFA_IDENT\", \"AFPRES_IDENT\", '100.00' FROM \"AFLBUD\" WHERE \"IDENT\" = "
+      "'0000000211'");
   point("C", 0, "CF26000001", "CF26000001");
   EXPECT_EQ(pieces(), "CF26000001:1 ");
   EXPECT_EQ(allocations("GAPLCOM|0000000401|1"), "0000000211 4 720.00; 0000000219 0 0.00; ");
@@ -135,8 +138,9 @@ TEST_F(ImputationTest, TwoSuitableLinesNeedArbitrationAndArbitrationCreatesMissi
 
   // Project AFF001's first budget has no line for the scaffolding service: arbitration makes one.
   t_.sql("UPDATE \"GAPLCOM\" SET \"SECAN_CODE\" = 'AFF001' WHERE \"NUMERO\" = '0000000404|1'");
-  t_.sql("DELETE FROM \"AFLBUD\" WHERE \"AFEBUD_IDENT\" = '0000000201' AND \"AFPRES_IDENT\" = "
-         "(SELECT \"AFPRES_IDENT\" FROM \"AFLBUD\" WHERE \"IDENT\" = '0000000234')");
+  t_.sql(
+      "DELETE FROM \"AFLBUD\" WHERE \"AFEBUD_IDENT\" = '0000000201' AND \"AFPRES_IDENT\" = "
+      "(SELECT \"AFPRES_IDENT\" FROM \"AFLBUD\" WHERE \"IDENT\" = '0000000234')");
   point("C", 1, "CF26000004", "CF26000004");
   EXPECT_EQ(pieces(), "CF26000004:0 ");
   std::string created = allocations("GAPLCOM|0000000404|1").substr(0, 10);

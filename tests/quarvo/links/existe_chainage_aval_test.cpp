@@ -43,7 +43,8 @@ TEST(ExisteChainageAvalTest, FindsTheLastDownstreamPieceOfTheExactSource) {
 
 TEST(ExisteChainageAvalTest, NoDownstreamPieceClearsBothResultsAndFails) {
   test::TestSession t;
-  t.sql(R"(INSERT INTO "CHAINAGE" ("CLE_SRC", "TYPE_DST", "IDE_DST") VALUES ('-2|123|1', -3, 'B'))");
+  t.sql(
+      R"(INSERT INTO "CHAINAGE" ("CLE_SRC", "TYPE_DST", "IDE_DST") VALUES ('-2|123|1', -3, 'B'))");
   Answer a = lookup(t, "-2", "12");  // 12 must not match the rows of 123
   EXPECT_EQ(a.type, "0");
   EXPECT_EQ(a.ident, "");

@@ -19,11 +19,13 @@ class InterfaceTest : public ::testing::Test {
   void link(const std::string& ident, const std::string& line, const std::string& kind,
             const std::string& piece, const std::string& number, double qte, double qtt,
             const std::string& ht, const std::string& project = "0000000011") {
-    t_.sql("INSERT INTO \"QUARVO\" (\"IDENT\", \"AFEBUD_IDENT\", \"AFAFFA_IDENT\", \"AFLBUD_IDENT\", "
-           "\"COMPOSANT\", \"COMPOSANT_IDENT\", \"PIECE\", \"DATE_PIECE\", \"QTE\", \"QTT\", \"HT\") "
-           "VALUES ('" + ident + "', '0000000201', '" + project + "', '" + line + "', '" + kind +
-           "', '" + piece + "', '" + number + "', '2026-05-12', " + std::to_string(qte) + ", " +
-           std::to_string(qtt) + ", '" + ht + "')");
+    t_.sql(
+        "INSERT INTO \"QUARVO\" (\"IDENT\", \"AFEBUD_IDENT\", \"AFAFFA_IDENT\", \"AFLBUD_IDENT\", "
+        "\"COMPOSANT\", \"COMPOSANT_IDENT\", \"PIECE\", \"DATE_PIECE\", \"QTE\", \"QTT\", \"HT\") "
+        "VALUES ('" +
+        ident + "', '0000000201', '" + project + "', '" + line + "', '" + kind + "', '" + piece +
+        "', '" + number + "', '2026-05-12', " + std::to_string(qte) + ", " + std::to_string(qtt) +
+        ", '" + ht + "')");
   }
   // A line mixing every kind of link.
   void mixedLinks() {
@@ -49,7 +51,8 @@ class InterfaceTest : public ::testing::Test {
   int64_t count(const std::string& table, const std::string& where) {
     Table t(nullptr, "VOVOVA", table, "COUNT");
     auto eq = where.find('=');
-    if (eq != std::string::npos) t.ajouterCritere(where.substr(0, eq), '=', Valeur::chaine(where.substr(eq + 1)));
+    if (eq != std::string::npos)
+      t.ajouterCritere(where.substr(0, eq), '=', Valeur::chaine(where.substr(eq + 1)));
     return t.compter();
   }
   test::TestSession t_;
@@ -84,15 +87,17 @@ TEST_F(InterfaceTest, RemainingFiguresAndProgressFollowTheBudget) {
   EXPECT_EQ(figures(), "0.00 | 7250.00;7250.00;7250.00 | 0.00;0.00;0.00 | 0 | 100");
 
   // A line without any budget: no remaining amount and no progress.
-  t_.sql("UPDATE \"AFLBUD\" SET \"VBUD_D\" = '0.00', \"HBUD\" = 0, \"VRAF\" = '5.00;5.00;5.00', "
-         "\"HRAF\" = 3 WHERE \"IDENT\" = '0000000212'");
+  t_.sql(
+      "UPDATE \"AFLBUD\" SET \"VBUD_D\" = '0.00', \"HBUD\" = 0, \"VRAF\" = '5.00;5.00;5.00', "
+      "\"HRAF\" = 3 WHERE \"IDENT\" = '0000000212'");
   link("0000005002", "0000000212", "GAPEFAC", "0000000601", "FF26000001", 1, 0, "10.00");
   ASSERT_EQ(call("VALIDATION_MAJ", {val("0000000212")}), 0);
   EXPECT_EQ(figures("0000000212"), "0.00 | 10.00;10.00;10.00 | 0.00;0.00;0.00 | 0 | 0");
 
   // A line whose remaining figures are kept by hand ("AFFECTE" O) keeps them.
-  t_.sql("UPDATE \"AFLBUD\" SET \"AFFECTE\" = 'O', \"VRAF\" = '999.00;998.00;997.00', \"HRAF\" = 4 "
-         "WHERE \"IDENT\" = '0000000213'");
+  t_.sql(
+      "UPDATE \"AFLBUD\" SET \"AFFECTE\" = 'O', \"VRAF\" = '999.00;998.00;997.00', \"HRAF\" = 4 "
+      "WHERE \"IDENT\" = '0000000213'");
   link("0000005003", "0000000213", "GAPECOM", "0000000401", "CF26000001", 1, 0, "50.00");
   ASSERT_EQ(call("VALIDATION_MAJ", {val("0000000213")}), 0);
   std::string kept = figures("0000000213");
@@ -123,7 +128,8 @@ TEST_F(InterfaceTest, DeletedPieceLeavesNoLinkAndNoAmountBehind) {
   EXPECT_EQ(figures("0000000212").substr(0, 4), "0.00");
   EXPECT_EQ(count("QUARVO", ""), 5);
 
-  t_.sql("INSERT INTO \"AFPFST\" (\"IDENT\", \"QUARVO_IDENT\") VALUES ('0000000001', '0000005005')");
+  t_.sql(
+      "INSERT INTO \"AFPFST\" (\"IDENT\", \"QUARVO_IDENT\") VALUES ('0000000001', '0000005005')");
   ASSERT_EQ(call("PURGER_AFEBUD", {val("0000000201"), val("CLOEXE")}), 0);
   EXPECT_EQ(count("QUARVO", ""), 0);
   EXPECT_EQ(count("AFPFST", ""), 0);
