@@ -6,6 +6,7 @@
 #include <set>
 
 #include "host/table/Table.h"
+#include "host/value/Identifiant.h"
 
 namespace quarvo::suite {
 
@@ -203,12 +204,6 @@ std::string attendu(ColKind kind) {
   }
 }
 
-std::string dixChiffres(int64_t n) {
-  std::string digits = std::to_string(n);
-  if (digits.size() < 10) digits.insert(0, 10 - digits.size(), '0');
-  return digits;
-}
-
 void ecrireErreurs(Session& session, const std::string& table, const fs::path& fichier,
                    const std::vector<ErreurChargement>& erreurs) {
   Transaction tx(session.db());
@@ -220,7 +215,7 @@ void ecrireErreurs(Session& session, const std::string& table, const fs::path& f
   if (nom.empty()) nom = fichier.string();
   for (const auto& e : erreurs) {
     err.preparer();
-    err.ecrire("IDENT", Valeur::chaine(dixChiffres(n++)));
+    err.ecrire("IDENT", Valeur::chaine(identifiant(n++)));
     err.ecrire("COMPOSANT", Valeur::chaine(table));
     err.ecrire("CODE", Valeur::chaine(e.piece));
     err.ecrire("DESIG", Valeur::chaine(e.ligne == 0 ? "Fichier " + nom
@@ -249,7 +244,7 @@ std::string ImportTexte::prochainNumeroErreur(Session& session) {
     std::from_chars(ident.data(), ident.data() + ident.size(), last);
   }
   (void)session;
-  return dixChiffres(last + 1);
+  return identifiant(last + 1);
 }
 
 ResultatChargement ImportTexte::charger(Session& session, const std::string& table,
@@ -350,7 +345,7 @@ ResultatChargement ImportTexte::charger(Session& session, const std::string& tab
       staging.ecrire("LIGNE_FICHIER", Valeur::entier(static_cast<int64_t>(no)));
       // Numbered here in file order (the table was just emptied), rather than by the table's
       // trigger, which would write every row a second time.
-      staging.ecrire("IDENT", Valeur::chaine(dixChiffres(lignes + 1)));
+      staging.ecrire("IDENT", Valeur::chaine(identifiant(lignes + 1)));
       if (saine && r.erreurs.empty()) {
         if (staging.inserer() != 0) {
           noter({no, "", "", "ligne refusée par la base de données", piece});

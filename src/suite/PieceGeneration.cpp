@@ -47,10 +47,14 @@ std::string PieceGeneration::lignes() const {
   return "GAPL" + table().substr(4);
 }
 
+void PieceGeneration::duModule(Table& t) const {
+  t.effacerCriteres();
+  t.ajouterCritere("TABLE", '=', Valeur::chaine(table()));
+}
+
 void PieceGeneration::echec(Evt* evt, const std::string& text) {
   Table erreurs(this, "", kErreurs, "");
-  erreurs.effacerCriteres();
-  erreurs.ajouterCritere("TABLE", '=', Valeur::chaine(table()));
+  duModule(erreurs);
   erreurs.supprimerTout();
   erreurs.preparer();
   erreurs.ecrire("TABLE", Valeur::chaine(table()));
@@ -66,8 +70,7 @@ void PieceGeneration::debutGeneration(Evt* evt) {
   std::string inst = table() + "-" + std::to_string(++compteur);
 
   Table etat(this, "", kEtat, "");
-  etat.effacerCriteres();
-  etat.ajouterCritere("TABLE", '=', Valeur::chaine(table()));
+  duModule(etat);
   if (etat.lire(3) == 0) {
     Table ancien(this, "", "M_GENERE", "ANCIEN");
     ancien.effacerCriteres();
@@ -96,8 +99,7 @@ void PieceGeneration::debutPieceGeneree(Evt* evt) {
   evt->param(0, ident, 1);
   ident.set("");
   Table etat(this, "", kEtat, "");
-  etat.effacerCriteres();
-  etat.ajouterCritere("TABLE", '=', Valeur::chaine(table()));
+  duModule(etat);
   if (etat.lire(3) != 0) {
     echec(evt, "Aucune génération de pièces " + table() + " n'est en cours.");
     return;
@@ -153,8 +155,7 @@ void PieceGeneration::debutPieceGeneree(Evt* evt) {
 
 void PieceGeneration::ligneCopiee(Evt* evt) {
   Table etat(this, "", kEtat, "");
-  etat.effacerCriteres();
-  etat.ajouterCritere("TABLE", '=', Valeur::chaine(table()));
+  duModule(etat);
   if (etat.lire(3) != 0 || etat.valeur("PIECE_IDENT").toChaine().empty()) {
     echec(evt, "Aucune pièce " + table() + " n'est en cours de génération.");
     return;
@@ -223,8 +224,7 @@ void PieceGeneration::ligneCopiee(Evt* evt) {
 
 void PieceGeneration::finPieceGeneree(Evt* evt) {
   Table etat(this, "", kEtat, "");
-  etat.effacerCriteres();
-  etat.ajouterCritere("TABLE", '=', Valeur::chaine(table()));
+  duModule(etat);
   std::string ident = etat.lire(3) == 0 ? etat.valeur("PIECE_IDENT").toChaine() : "";
   Table piece(this, "GESCOM", table(), "GENERATION");
   if (ident.empty() || piece.chercher(3, "IDENT", '=', Valeur::chaine(ident)) != 0) {
@@ -256,8 +256,7 @@ void PieceGeneration::finPieceGeneree(Evt* evt) {
 
 void PieceGeneration::finGeneration(Evt* evt) {
   Table etat(this, "", kEtat, "");
-  etat.effacerCriteres();
-  etat.ajouterCritere("TABLE", '=', Valeur::chaine(table()));
+  duModule(etat);
   if (etat.lire(3) != 0) {
     echec(evt, "Aucune génération de pièces " + table() + " n'est en cours.");
     return;
@@ -274,8 +273,7 @@ void PieceGeneration::texteErreur(Evt* evt) {
   Field& texte = chaine("P_TEXTE");
   evt->param(0, texte, 1);
   Table erreurs(this, "", kErreurs, "");
-  erreurs.effacerCriteres();
-  erreurs.ajouterCritere("TABLE", '=', Valeur::chaine(table()));
+  duModule(erreurs);
   texte.set(erreurs.lire(3) == 0 ? erreurs.valeur("TEXTE").toChaine()
                                  : "Erreur de génération des pièces " + table() + ".");
   erreurMethode(0, evt);

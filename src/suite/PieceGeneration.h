@@ -50,6 +50,8 @@ class PieceGeneration : public TableInterface {
 
   // Records `text` as the module's last failure and fails the call.
   void echec(host::Evt* evt, const std::string& text);
+  // Selects the rows of this module in one of the session's generation tables.
+  void duModule(host::Table& t) const;
   std::string lignes() const;
 };
 

@@ -1,6 +1,7 @@
 #include "suite/Settling.h"
 
 #include <algorithm>
+#include <memory>
 
 #include "host/session/Session.h"
 #include "host/table/Table.h"
@@ -36,6 +37,15 @@ bool trouver(Table& t, const Valeur& ident) {
   return t.chercher(3, "IDENT", '=', ident) == 0;
 }
 
+// A cursor of `owner` on the piece header or line `ident` to settle, in `table` (empty for an
+// unknown kind of piece); null when there is no such row.
+std::unique_ptr<Table> aSolder(Automate& owner, const std::string& table, const Valeur& ident) {
+  if (table.empty()) return nullptr;
+  auto row = std::make_unique<Table>(&owner, "GESCOM", table, "SOLDE");
+  if (!trouver(*row, ident)) return nullptr;
+  return row;
+}
+
 }  // namespace
 
 // ---------------------------------------------------------------------------------------------
@@ -53,20 +63,15 @@ void Gcpfour::debutSolde(Evt* evt) {
 }
 
 void Gcpfour::soldePiece(Evt* evt) {
-  std::string header = tableEntete(toEntier(evt->valeur(0)));
-  if (header.empty()) {
+  auto piece = aSolder(*this, tableEntete(toEntier(evt->valeur(0))), evt->valeur(1));
+  if (!piece) {
     erreurMethode(1, evt);
     return;
   }
-  Table piece(this, "GESCOM", header, "SOLDE");
-  if (!trouver(piece, evt->valeur(1))) {
-    erreurMethode(1, evt);
-    return;
-  }
-  piece.ecrire("SOLDEE", Valeur::entier(1));
-  piece.ecrire("MTNT_HT", Valeur::monnaie(toMonnaie(evt->valeur(2))));
-  piece.ecrire("MTNT_TTC", Valeur::monnaie(toMonnaie(evt->valeur(3))));
-  erreurMethode(piece.modifier(), evt);
+  piece->ecrire("SOLDEE", Valeur::entier(1));
+  piece->ecrire("MTNT_HT", Valeur::monnaie(toMonnaie(evt->valeur(2))));
+  piece->ecrire("MTNT_TTC", Valeur::monnaie(toMonnaie(evt->valeur(3))));
+  erreurMethode(piece->modifier(), evt);
 }
 
 // ---------------------------------------------------------------------------------------------
@@ -128,33 +133,23 @@ Gcpx::Gcpx(Evt* evt) : Interface2(evt) {
 }
 
 void Gcpx::soldeLigne(Evt* evt) {
-  std::string lines = tableLignes(toEntier(evt->valeur(0)));
-  if (lines.empty()) {
+  auto line = aSolder(*this, tableLignes(toEntier(evt->valeur(0))), evt->valeur(2));
+  if (!line) {
     erreurMethode(1, evt);
     return;
   }
-  Table line(this, "GESCOM", lines, "SOLDE");
-  if (!trouver(line, evt->valeur(2))) {
-    erreurMethode(1, evt);
-    return;
-  }
-  line.ecrire("QTE_SOLDEE", Valeur::dbl(toDouble(evt->valeur(3)) - toDouble(evt->valeur(4))));
-  erreurMethode(line.modifier(), evt);
+  line->ecrire("QTE_SOLDEE", Valeur::dbl(toDouble(evt->valeur(3)) - toDouble(evt->valeur(4))));
+  erreurMethode(line->modifier(), evt);
 }
 
 void Gcpx::soldePiece(Evt* evt) {
-  std::string header = tableEntete(toEntier(evt->valeur(0)));
-  if (header.empty()) {
+  auto piece = aSolder(*this, tableEntete(toEntier(evt->valeur(0))), evt->valeur(1));
+  if (!piece) {
     erreurMethode(1, evt);
     return;
   }
-  Table piece(this, "GESCOM", header, "SOLDE");
-  if (!trouver(piece, evt->valeur(1))) {
-    erreurMethode(1, evt);
-    return;
-  }
-  piece.ecrire("QTNT", Valeur::dbl(0.0));
-  erreurMethode(piece.modifier(), evt);
+  piece->ecrire("QTNT", Valeur::dbl(0.0));
+  erreurMethode(piece->modifier(), evt);
 }
 
 // ---------------------------------------------------------------------------------------------

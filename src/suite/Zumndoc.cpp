@@ -5,6 +5,7 @@
 
 #include "host/session/Session.h"
 #include "host/table/Table.h"
+#include "host/value/Identifiant.h"
 
 namespace quarvo::suite {
 
@@ -15,14 +16,6 @@ bool isNumber(const std::string& s, int64_t& out) {
   if (s.empty()) return false;
   auto [p, ec] = std::from_chars(s.data(), s.data() + s.size(), out);
   return ec == std::errc() && p == s.data() + s.size();
-}
-
-std::string padded(int64_t n, int width) {
-  std::string digits = std::to_string(n);
-  if (static_cast<int>(digits.size()) < width) {
-    digits.insert(0, static_cast<size_t>(width) - digits.size(), '0');
-  }
-  return digits;
 }
 }  // namespace
 
@@ -87,7 +80,7 @@ void Zumndoc::attribuer(Evt* evt) {
     counter.inserer();
   }
   if (tx) tx->commit();
-  ident.set(padded(next, r.width));
+  ident.set(identifiant(next, r.width));
   erreurMethode(0, evt);
 }
 

@@ -36,8 +36,7 @@ void Parcours::executer(Evt* evt) {
     // The selection in the sort plan's order, ties in key order: the store orders it when it
     // can, else it comes in key order and is sorted here (stable).
     std::vector<RowId> order;
-    if (sort_.empty() || t.ouvrirTrie(sort_)) {
-      if (sort_.empty()) t.ouvrir();
+    if (t.ouvrirTrie(sort_)) {
       order.reserve(t.tailleSelection());
       for (size_t i = 0; i < t.tailleSelection(); ++i) order.push_back(t.selectionnee(i));
     } else {

@@ -440,41 +440,40 @@ class SqliteStore : public TableStore {
   void bindColumn(sqlite3_stmt* st, int n, const Row& row, size_t i) {
     const ColumnInfo& col = schema_.columns()[i];
     if (i >= row.values.size()) {
-      bindValue(st, n, storageForm(col.kind, defaultOf(col.kind)));
+      bindStored(st, n, defaultOf(col.kind));
       return;
     }
     const Valeur& v = row.values[i];
     if (v.kind() == valueKindOf(col.kind)) {
-      // Already of the column's kind (cursors write values fitted): bound without a copy.
-      switch (v.kind()) {
-        case Kind::Chaine: {
-          const std::string& text = v.asChaine();
-          sqlite3_bind_text(st, n, text.data(), static_cast<int>(text.size()), SQLITE_TRANSIENT);
-          return;
-        }
-        case Kind::Entier:
-          sqlite3_bind_int64(st, n, v.asEntier());
-          return;
-        case Kind::Double:
-          sqlite3_bind_double(st, n, v.asDouble());
-          return;
-        case Kind::Monnaie:
-        case Kind::Date: {
-          std::string text = v.kind() == Kind::Monnaie ? v.asMonnaie().text() : v.asDate().iso();
-          sqlite3_bind_text(st, n, text.data(), static_cast<int>(text.size()), SQLITE_TRANSIENT);
-          return;
-        }
-        default:
-          bindValue(st, n, storageForm(col.kind, v));
-          return;
-      }
+      bindStored(st, n, v);  // already of the column's kind, as cursors write values
+      return;
     }
     auto fitted = fitColumn(col, v);
     if (!fitted) {
       throw UException("value '" + v.toChaine() + "' does not fit column " + name_ + "." +
                        col.name);
     }
-    bindValue(st, n, storageForm(col.kind, *fitted));
+    bindStored(st, n, *fitted);
+  }
+
+  // Binds a value of its column's kind as it is stored (see storageForm), without a copy of
+  // its text.
+  static void bindStored(sqlite3_stmt* st, int n, const Valeur& v) {
+    switch (v.kind()) {
+      case Kind::Chaine: {
+        const std::string& text = v.asChaine();
+        sqlite3_bind_text(st, n, text.data(), static_cast<int>(text.size()), SQLITE_TRANSIENT);
+        return;
+      }
+      case Kind::Monnaie:
+      case Kind::Date: {
+        std::string text = v.kind() == Kind::Monnaie ? v.asMonnaie().text() : v.asDate().iso();
+        sqlite3_bind_text(st, n, text.data(), static_cast<int>(text.size()), SQLITE_TRANSIENT);
+        return;
+      }
+      default:
+        bindValue(st, n, v);
+    }
   }
 
   static Valeur readColumn(sqlite3_stmt* st, int i, ColKind k) {

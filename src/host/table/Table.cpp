@@ -56,6 +56,10 @@ int Table::ouvrir() {
 }
 
 bool Table::ouvrirTrie(const std::vector<std::string>& tri) {
+  if (tri.empty()) {
+    ouvrir();  // key order is the order asked
+    return true;
+  }
   auto ids = store().selectTriee(criteria_, tri);
   if (!ids) return false;
   selection_ = std::move(*ids);

@@ -44,8 +44,8 @@ class Table {
   void verrouiller(char mode = 'E') { lock_ = mode; }
   // Opens the selection; returns 0 when it holds at least one row.
   int ouvrir();
-  // Opens the selection ordered on `tri` (ties in key order) when the store can order it;
-  // false, and nothing opened, when it cannot.
+  // Opens the selection ordered on `tri` (ties in key order; no columns is key order) when the
+  // store can order it; false, and nothing opened, when it cannot.
   bool ouvrirTrie(const std::vector<std::string>& tri);
   // mode 1 next row, 3 first row, 4 last row. Opens the selection when it is not open.
   int lire(int mode = 1, char option = 'A');

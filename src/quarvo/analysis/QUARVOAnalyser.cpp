@@ -1,7 +1,6 @@
 #include "quarvo/analysis/QUARVOAnalyser.h"
 
 #include <cmath>
-#include <cstdio>
 #include <optional>
 #include <string_view>
 
@@ -9,6 +8,7 @@
 #include "host/UException.h"
 #include "host/session/Session.h"
 #include "host/table/Database.h"
+#include "host/value/Identifiant.h"
 
 namespace quarvo {
 
@@ -50,12 +50,6 @@ const QUARVOAnalyser::Kind* QUARVOAnalyser::kindOf(const std::string& headerTabl
 }
 
 namespace {
-// Error rows are numbered with ten zero-filled digits.
-std::string dixChiffres(int64_t n) {
-  char text[32];
-  std::snprintf(text, sizeof text, "%010lld", static_cast<long long>(n));
-  return text;
-}
 // Attempts at numbering an error row when other rows took the numbers meanwhile.
 constexpr int kEssaisNumero = 3;
 }  // namespace
@@ -445,7 +439,7 @@ void QUARVOAnalyser::ecrire_erreur(Evt*) {
   for (;;) {
     pIdent_.set(pIdent_.dbl() + 1);
     immErreur_.preparer();
-    erreurIdent_.set(dixChiffres(std::llround(pIdent_.dbl())));
+    erreurIdent_.set(identifiant(std::llround(pIdent_.dbl())));
     erreurComposant_.set(pCompo_.text());
     erreurCode_.set(pCode_.text());
     erreurDesig_.set(pDesig_.text());

@@ -1,4 +1,4 @@
-// Small text helpers shared by the import automata: error numbers, characters of a text
+// Small text helpers shared by the import automata: numbers read from text, characters of a text
 // counted as characters (not bytes), the company's current month.
 #pragma once
 
@@ -9,13 +9,6 @@
 #include "host/value/Date.h"
 
 namespace quarvo::import {
-
-// "0000000042": the mask "000000000#" of error numbers.
-inline std::string dixChiffres(int64_t n) {
-  std::string digits = std::to_string(n);
-  if (digits.size() < 10) digits.insert(0, 10 - digits.size(), '0');
-  return digits;
-}
 
 inline int64_t enNombre(const std::string& text) {
   int64_t n = 0;

@@ -4,12 +4,13 @@
 #include <set>
 
 #include "host/session/Session.h"
+#include "host/value/Identifiant.h"
 #include "quarvo/import/ImportOutils.h"
 
 namespace quarvo {
 
 using namespace host;
-using import::dixChiffres;
+using host::identifiant;
 using import::enNombre;
 
 QUARVOImport_controler::QUARVOImport_controler(Evt* evt, const DifferencesControle& kind)
@@ -78,7 +79,7 @@ void QUARVOImport_controler::debut(Evt* evt) {
   int64_t last = 0;
   if (erreurs_.lire(4, 'A') == 0) last = enNombre(erreurs_.valeur("IDENT").toChaine());
   vIdent_.set(static_cast<double>(last));
-  premiereErreur_ = dixChiffres(last + 1);
+  premiereErreur_ = identifiant(last + 1);
 
   Table compte(this, "VOVOVA", kind_.staging, "COMPTE");
   compte.effacerCriteres();
@@ -207,7 +208,7 @@ void QUARVOImport_controler::jauge() {
 void QUARVOImport_controler::ecrire_erreur(Evt* evt) {
   vIdent_.set(vIdent_.dbl() + 1);
   erreurs_.preparer();
-  erreurs_.ecrire("IDENT", Valeur::chaine(dixChiffres(static_cast<int64_t>(vIdent_.dbl()))));
+  erreurs_.ecrire("IDENT", Valeur::chaine(identifiant(static_cast<int64_t>(vIdent_.dbl()))));
   erreurs_.ecrire("COMPOSANT", Valeur::chaine(kind_.staging));
   erreurs_.ecrire("CODE", Valeur::chaine(pieceCourante_));
   erreurs_.ecrire("DESIG", Valeur::chaine(kind_.prefixe + pieceCourante_));
