@@ -27,6 +27,16 @@ struct Reset {
   ~Reset() { sqlite3_reset(stmt); }
 };
 
+// The same for a statement whose texts were bound without a copy (SQLITE_STATIC): they belong
+// to the row being written, so the bindings are cleared before that row can go away.
+struct ResetDelie {
+  sqlite3_stmt* stmt;
+  ~ResetDelie() {
+    sqlite3_reset(stmt);
+    sqlite3_clear_bindings(stmt);
+  }
+};
+
 }  // namespace
 
 // A persistent table of the SQLite database.
@@ -219,7 +229,7 @@ class SqliteStore : public TableStore {
     selections_.clear();  // the new row may match any of them
     if (insertSt_ == nullptr) insertSt_ = db_.prepare(insertSql_);
     sqlite3_stmt* st = insertSt_;
-    Reset reset{st};
+    ResetDelie reset{st};
     bindRow(st, row);
     step(st, "insert into");
     return sqlite3_last_insert_rowid(db_.handle());
@@ -263,7 +273,7 @@ class SqliteStore : public TableStore {
         st = db_.prepare(sql + " WHERE rowid = ?");
       }
     }
-    Reset reset{st};
+    ResetDelie reset{st};
     for (size_t k = 0; k < ecrites.size(); ++k)
       bindColumn(st, static_cast<int>(k) + 1, row, ecrites[k]);
     sqlite3_bind_int64(st, static_cast<int>(ecrites.size()) + 1, id);
@@ -440,12 +450,12 @@ class SqliteStore : public TableStore {
   void bindColumn(sqlite3_stmt* st, int n, const Row& row, size_t i) {
     const ColumnInfo& col = schema_.columns()[i];
     if (i >= row.values.size()) {
-      bindStored(st, n, defaultOf(col.kind));
+      bindStored(st, n, defaultOf(col.kind), SQLITE_TRANSIENT);
       return;
     }
     const Valeur& v = row.values[i];
     if (v.kind() == valueKindOf(col.kind)) {
-      bindStored(st, n, v);  // already of the column's kind, as cursors write values
+      bindStored(st, n, v, SQLITE_STATIC);  // already of the column's kind, as cursors write values
       return;
     }
     auto fitted = fitColumn(col, v);
@@ -453,16 +463,17 @@ class SqliteStore : public TableStore {
       throw UException("value '" + v.toChaine() + "' does not fit column " + name_ + "." +
                        col.name);
     }
-    bindStored(st, n, *fitted);
+    bindStored(st, n, *fitted, SQLITE_TRANSIENT);
   }
 
-  // Binds a value of its column's kind as it is stored (see storageForm), without a copy of
-  // its text.
-  static void bindStored(sqlite3_stmt* st, int n, const Valeur& v) {
+  // Binds a value of its column's kind as it is stored (see storageForm). With SQLITE_STATIC a
+  // text is bound without a copy: `v` is then the row's own value, alive until the statement
+  // has run, and the bindings are cleared after (ResetDelie).
+  static void bindStored(sqlite3_stmt* st, int n, const Valeur& v, sqlite3_destructor_type texte) {
     switch (v.kind()) {
       case Kind::Chaine: {
         const std::string& text = v.asChaine();
-        sqlite3_bind_text(st, n, text.data(), static_cast<int>(text.size()), SQLITE_TRANSIENT);
+        sqlite3_bind_text(st, n, text.data(), static_cast<int>(text.size()), texte);
         return;
       }
       case Kind::Monnaie:

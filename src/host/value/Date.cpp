@@ -96,9 +96,26 @@ std::string Date::text() const {
 
 std::string Date::iso() const {
   if (empty()) return "";
-  char buf[16];
-  std::snprintf(buf, sizeof buf, "%04d-%02u-%02u", year(), month(), day());
-  return buf;
+  // By hand rather than snprintf: dates are formatted for every row written to the database.
+  int y = year();
+  unsigned m = month();
+  unsigned d = day();
+  if (y < 0 || y > 9999) {
+    char buf[24];
+    std::snprintf(buf, sizeof buf, "%04d-%02u-%02u", y, m, d);
+    return buf;
+  }
+  char buf[10] = {static_cast<char>('0' + y / 1000),
+                  static_cast<char>('0' + y / 100 % 10),
+                  static_cast<char>('0' + y / 10 % 10),
+                  static_cast<char>('0' + y % 10),
+                  '-',
+                  static_cast<char>('0' + m / 10),
+                  static_cast<char>('0' + m % 10),
+                  '-',
+                  static_cast<char>('0' + d / 10),
+                  static_cast<char>('0' + d % 10)};
+  return std::string(buf, sizeof buf);
 }
 
 int Date::year() const {

@@ -152,15 +152,19 @@ double Monnaie::toDouble() const {
 }
 
 std::string Monnaie::text() const {
-  uint64_t magnitude = micros_ < 0 ? uint64_t(-micros_) : uint64_t(micros_);
-  std::string frac = std::to_string(magnitude % kScale);
-  frac.insert(0, kDecimals - frac.size(), '0');
-  while (frac.size() > 2 && frac.back() == '0') frac.pop_back();
-  std::string out = micros_ < 0 ? "-" : "";
-  out += std::to_string(magnitude / kScale);
-  out += '.';
-  out += frac;
-  return out;
+  // Written into a buffer once: amounts are formatted for every row written to the database.
+  uint64_t magnitude = micros_ < 0 ? 0 - uint64_t(micros_) : uint64_t(micros_);
+  char buf[32];
+  char* p = buf;
+  if (micros_ < 0) *p++ = '-';
+  p = std::to_chars(p, buf + sizeof buf, magnitude / kScale).ptr;
+  *p++ = '.';
+  uint64_t frac = magnitude % kScale;
+  char* debut = p;
+  for (uint64_t div = kScale / 10; div > 0; div /= 10)
+    *p++ = static_cast<char>('0' + frac / div % 10);
+  while (p - debut > 2 && p[-1] == '0') --p;
+  return std::string(buf, p);
 }
 
 Monnaie& Monnaie::operator+=(Monnaie other) {
