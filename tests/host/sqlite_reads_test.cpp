@@ -2,6 +2,10 @@
 // transactions: every read must still give what the file holds, whoever changed it.
 #include <gtest/gtest.h>
 
+#include <chrono>
+#include <filesystem>
+#include <thread>
+
 #include "host/table/Table.h"
 #include "support/TestSession.h"
 
@@ -150,6 +154,36 @@ TEST_F(SqliteReadsTest, GroupedUnitsAreWholeOrAbsentAndCommittedByGroups) {
   }  // cut short: the open group is rolled back, as a crash would
   EXPECT_EQ(compter(), 4);
   EXPECT_EQ(t_.db().depth(), 0);
+}
+
+// The log is copied into the file by the database's own thread once a commit leaves it past
+// the threshold, while writing goes on; closing leaves the file whole without the log.
+TEST(SqliteCheckpointTest, TheLogIsCopiedInTheBackgroundAndNothingIsLost) {
+  test::TestSession t;
+  const auto chemin = t.dir() / "journal.db";
+  {
+    SqliteDatabase db(chemin, true, 8);
+    db.execScript(R"(CREATE TABLE "T_LOG" ("IDENT" INTEGER, "TEXTE" TEXT);)");
+    auto ecrire = [&](int debut, int n) {
+      Transaction tx(db);
+      for (int i = debut; i < debut + n; ++i) {
+        db.execScript("INSERT INTO \"T_LOG\" VALUES (" + std::to_string(i) +
+                      ", printf('%.*c', 3000, 'x'));");
+      }
+      tx.commit();
+    };
+    ecrire(0, 2);  // a few pages: below the threshold, no thread
+    EXPECT_EQ(db.checkpointsEnFond(), 0);
+    for (int k = 0; k < 20; ++k) ecrire(2 + 10 * k, 10);
+    for (int attente = 0; attente < 500 && db.checkpointsEnFond() == 0; ++attente) {
+      std::this_thread::sleep_for(std::chrono::milliseconds(10));
+    }
+    EXPECT_GT(db.checkpointsEnFond(), 0);
+    ecrire(202, 10);  // writing goes on after a copy
+  }
+  EXPECT_FALSE(std::filesystem::exists(chemin.string() + "-wal"));
+  SqliteDatabase relu(chemin, false);
+  EXPECT_EQ(relu.store("T_LOG")->count({}), 212);
 }
 
 }  // namespace

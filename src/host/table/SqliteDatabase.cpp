@@ -3,7 +3,12 @@
 #include <sqlite3.h>
 
 #include <algorithm>
+#include <atomic>
 #include <cctype>
+#include <condition_variable>
+#include <mutex>
+#include <stop_token>
+#include <thread>
 
 #include "host/UException.h"
 
@@ -545,7 +550,83 @@ namespace {
 }();
 }  // namespace
 
-SqliteDatabase::SqliteDatabase(const std::filesystem::path& path, bool create) : path_(path) {
+// Copies the write-ahead log into the database file on a thread of its own. SQLite's automatic
+// checkpoint runs inside the commit that crosses its threshold, on the writer's time; a passive
+// checkpoint from another connection needs no lock the writer holds, so the writer goes on
+// while the pages are copied and the file synced. When the log has been copied whole, the
+// writer's next transaction starts it again from the beginning. Failures are left to the next
+// request: the writer checkpoints itself if the log keeps growing (see surCommit).
+class CheckpointEnFond {
+ public:
+  explicit CheckpointEnFond(std::filesystem::path path)
+      : path_(std::move(path)), thread_([this](std::stop_token stop) { boucle(stop); }) {}
+
+  // Stops the thread, after the copy in progress if any.
+  ~CheckpointEnFond() {
+    thread_.request_stop();
+    thread_.join();
+  }
+
+  void demander() {
+    {
+      std::lock_guard lock(mutex_);
+      demande_ = true;
+    }
+    cv_.notify_one();
+  }
+
+  int64_t faits() const { return faits_.load(); }
+
+ private:
+  void boucle(std::stop_token stop) {
+    sqlite3* db = nullptr;
+    if (sqlite3_open_v2(path_.c_str(), &db, SQLITE_OPEN_READWRITE | SQLITE_OPEN_NOMUTEX, nullptr) !=
+        SQLITE_OK) {
+      sqlite3_close(db);
+      return;  // the writer's own checkpoints take over
+    }
+    sqlite3_busy_timeout(db, 1000);
+    while (true) {
+      {
+        std::unique_lock lock(mutex_);
+        if (!cv_.wait(lock, stop, [this] { return demande_; })) break;
+        demande_ = false;
+      }
+      if (sqlite3_wal_checkpoint_v2(db, nullptr, SQLITE_CHECKPOINT_PASSIVE, nullptr, nullptr) ==
+          SQLITE_OK) {
+        ++faits_;
+      }
+    }
+    sqlite3_close(db);
+  }
+
+  std::filesystem::path path_;
+  std::mutex mutex_;
+  std::condition_variable_any cv_;
+  bool demande_ = false;
+  std::atomic<int64_t> faits_{0};
+  std::jthread thread_;  // last: it starts once the members above exist
+};
+
+int SqliteDatabase::surCommit(void* self, sqlite3* db, const char* base, int pages) {
+  auto& database = *static_cast<SqliteDatabase*>(self);
+  if (pages >= 4 * database.pagesCheckpoint_) {
+    // The thread is not keeping up (or cannot open the file): bound the log here.
+    sqlite3_wal_checkpoint_v2(db, base, SQLITE_CHECKPOINT_PASSIVE, nullptr, nullptr);
+  } else if (pages >= database.pagesCheckpoint_) {
+    if (!database.checkpoint_)
+      database.checkpoint_ = std::make_unique<CheckpointEnFond>(database.path_);
+    database.checkpoint_->demander();
+  }
+  return SQLITE_OK;
+}
+
+int64_t SqliteDatabase::checkpointsEnFond() const {
+  return checkpoint_ ? checkpoint_->faits() : 0;
+}
+
+SqliteDatabase::SqliteDatabase(const std::filesystem::path& path, bool create, int pagesCheckpoint)
+    : path_(path), pagesCheckpoint_(pagesCheckpoint) {
   // A connection serves one session, on one thread: no locking of its own is needed.
   int flags = SQLITE_OPEN_READWRITE | SQLITE_OPEN_NOMUTEX | (create ? SQLITE_OPEN_CREATE : 0);
   if (sqlite3_open_v2(path.c_str(), &db_, flags, nullptr) != SQLITE_OK) {
@@ -561,8 +642,7 @@ SqliteDatabase::SqliteDatabase(const std::filesystem::path& path, bool create) :
   try {
     execScript(
         "PRAGMA journal_mode = WAL; PRAGMA synchronous = NORMAL; PRAGMA foreign_keys = OFF; "
-        "PRAGMA cache_size = -65536; PRAGMA mmap_size = 268435456; PRAGMA wal_autocheckpoint = "
-        "8192;");
+        "PRAGMA cache_size = -65536; PRAGMA mmap_size = 268435456;");
   } catch (...) {
     // A file that is not a database fails here: the destructor will not run, so close now.
     for (auto& [sql, st] : statements_) sqlite3_finalize(st);
@@ -571,9 +651,12 @@ SqliteDatabase::SqliteDatabase(const std::filesystem::path& path, bool create) :
     db_ = nullptr;
     throw;
   }
+  // In place of SQLite's automatic checkpoint (it is this same hook).
+  sqlite3_wal_hook(db_, &SqliteDatabase::surCommit, this);
 }
 
 SqliteDatabase::~SqliteDatabase() {
+  checkpoint_.reset();  // before the close, which copies what is left of the log
   stores_.clear();
   for (auto& [sql, st] : statements_) sqlite3_finalize(st);
   while (depth_ > 0) rollback();

@@ -12,10 +12,15 @@
 // line. A write to a table forgets its selections (and the written row); a rollback or a script
 // forgets everything; so does a new transaction when another connection committed meanwhile.
 // Outside transactions every read goes to the file.
+//
+// Committed pages go to the write-ahead log; a thread of the database, with a connection of its
+// own, copies the log back into the file once it has grown past a threshold (see
+// CheckpointEnFond), so that a long batch does not wait for those copies and their syncs.
 #pragma once
 
 #include <cstdint>
 #include <map>
+#include <memory>
 #include <unordered_map>
 
 #include "host/table/Database.h"
@@ -26,11 +31,18 @@ struct sqlite3_stmt;
 namespace quarvo::host {
 
 class SqliteStore;
+class CheckpointEnFond;
 
 class SqliteDatabase : public Database {
  public:
+  // Past this many pages in the write-ahead log, a commit asks the background thread to copy
+  // the log into the file; past four times as many, the commit copies it itself.
+  static constexpr int kPagesCheckpoint = 8192;
+
   // Opens (and creates when `create`) the file. Throws UException when it cannot be opened.
-  SqliteDatabase(const std::filesystem::path& path, bool create);
+  // `pagesCheckpoint` is the threshold above (tests lower it).
+  SqliteDatabase(const std::filesystem::path& path, bool create,
+                 int pagesCheckpoint = kPagesCheckpoint);
   ~SqliteDatabase() override;
   SqliteDatabase(const SqliteDatabase&) = delete;
   SqliteDatabase& operator=(const SqliteDatabase&) = delete;
@@ -51,6 +63,8 @@ class SqliteDatabase : public Database {
   // Reads may be answered from what the stores remember: only inside a transaction, where no
   // other connection can change the file.
   bool memoireActive() const { return depth_ > 0; }
+  // Copies of the log into the file done so far by the background thread.
+  int64_t checkpointsEnFond() const;
 
  private:
   std::filesystem::path path_;
@@ -59,6 +73,10 @@ class SqliteDatabase : public Database {
   // Runs one cached statement that returns no rows.
   void pas(const std::string& sql);
   void oublierLectures();
+  static int surCommit(void* self, sqlite3* db, const char* base, int pages);
+
+  int pagesCheckpoint_;
+  std::unique_ptr<CheckpointEnFond> checkpoint_;  // started by the first commit that needs it
 
   int depth_ = 0;
   int64_t dataVersion_ = -1;
