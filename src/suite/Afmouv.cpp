@@ -32,7 +32,7 @@ void Afmouv::lectureCleCompo(Evt* evt) {
     erreurMethode(1, evt);
     return;
   }
-  record.firstRow() = moves.ligne();
+  record.remplacerPar(moves.ligne());
   erreurMethode(0, evt);
 }
 

@@ -25,7 +25,7 @@ void Parametres::lecture(Evt* evt) {
     erreurMethode(1, evt);
     return;
   }
-  record.firstRow() = main.ligne();
+  record.remplacerPar(main.ligne());
   erreurMethode(0, evt);
 }
 

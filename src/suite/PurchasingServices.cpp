@@ -37,7 +37,7 @@ void Gcpste::lecture(Evt* evt) {
     erreurMethode(1, evt);
     return;
   }
-  record.firstRow() = settings.ligne();
+  record.remplacerPar(settings.ligne());
   erreurMethode(0, evt);
 }
 
@@ -119,7 +119,7 @@ void Gapartfo::lectureEtCreation(Evt* evt) {
       return;
     }
   }
-  record.firstRow() = lien.ligne();
+  record.remplacerPar(lien.ligne());
   erreurMethode(0, evt);
 }
 

@@ -213,7 +213,7 @@ void Gaplot::lireSuivant(Evt* evt) {
   while (lots.lire(1) == 0) {
     std::string ident = lots.valeur("IDENT").toChaine();
     if (!dernier.empty() && ident <= dernier) continue;
-    record.firstRow() = lots.ligne();
+    record.remplacerPar(lots.ligne());
     etat.ecrire("DERNIER", Valeur::chaine(ident));
     etat.modifier();
     erreurMethode(0, evt);

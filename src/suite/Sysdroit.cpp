@@ -25,7 +25,7 @@ void Sysdroit::lectureDroitsCourants(Evt* evt) {
     erreurMethode(1, evt);
     return;
   }
-  record.firstRow() = rights.ligne();
+  record.remplacerPar(rights.ligne());
   erreurMethode(0, evt);
 }
 

@@ -32,7 +32,7 @@ bool TableInterface::lireDans(const std::string& column, const Valeur& value) {
   record.clear();
   if (!main.store().schema().index(column)) return false;
   if (main.chercher(3, column, '=', value) != 0) return false;
-  record.firstRow() = main.ligne();
+  record.remplacerPar(main.ligne());
   return true;
 }
 

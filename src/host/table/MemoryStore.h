@@ -37,6 +37,11 @@ class MemoryStore : public TableStore {
   void setKey(const std::vector<std::string>& columns);
   // The first row, created empty when the table has none (interface records are one row).
   Row& firstRow();
+  // Makes `row` the table's only row: an interface record taking the row just read.
+  void remplacerPar(const Row& row) {
+    clear();
+    insert(row);
+  }
   void clear() {
     rows_.clear();
     index_.clear();
