@@ -226,7 +226,7 @@ class SqliteStore : public TableStore {
     const auto& cols = schema_.columns();
     out.values.resize(cols.size());
     for (size_t i = 0; i < cols.size(); ++i)
-      out.values[i] = readColumn(st, static_cast<int>(i), cols[i].kind);
+      readColumn(st, static_cast<int>(i), cols[i].kind, out.values[i]);
     return true;
   }
 
@@ -492,28 +492,34 @@ class SqliteStore : public TableStore {
     }
   }
 
-  static Valeur readColumn(sqlite3_stmt* st, int i, ColKind k) {
+  // Reads column i of the current result row into `out`, in the column's kind.
+  static void readColumn(sqlite3_stmt* st, int i, ColKind k, Valeur& out) {
     int type = sqlite3_column_type(st, i);
-    if (type == SQLITE_NULL) return defaultOf(k);
+    if (type == SQLITE_NULL) {
+      out = defaultOf(k);
+      return;
+    }
     switch (k) {
       case ColKind::Integer:
-        return Valeur::entier(sqlite3_column_int64(st, i));
+        out = Valeur::entier(sqlite3_column_int64(st, i));
+        return;
       case ColKind::Real:
-        return Valeur::dbl(sqlite3_column_double(st, i));
+        out = Valeur::dbl(sqlite3_column_double(st, i));
+        return;
       default:
         break;
     }
-    std::string text(reinterpret_cast<const char*>(sqlite3_column_text(st, i)),
-                     static_cast<size_t>(sqlite3_column_bytes(st, i)));
+    std::string_view text(reinterpret_cast<const char*>(sqlite3_column_text(st, i)),
+                          static_cast<size_t>(sqlite3_column_bytes(st, i)));
     if (k == ColKind::Decimal) {
       auto m = Monnaie::parse(text);
-      return Valeur::monnaie(m ? *m : Monnaie());
-    }
-    if (k == ColKind::Date) {
+      out = Valeur::monnaie(m ? *m : Monnaie());
+    } else if (k == ColKind::Date) {
       auto d = Date::parse(text);
-      return Valeur::date(d ? *d : Date());
+      out = Valeur::date(d ? *d : Date());
+    } else {
+      out.assignerChaine(text);
     }
-    return Valeur::chaine(std::move(text));
   }
 
   SqliteDatabase& db_;

@@ -172,24 +172,24 @@ const Row& Table::ligne() {
   return buffer_;
 }
 
-Valeur Table::valeur(const std::string& column) {
+Valeur Table::valeur(std::string_view column) {
   TableStore& s = store();
   auto i = s.schema().index(column);
   if (!i) {
     if (s.extensible()) return Valeur();
-    throw UException("table " + name_ + " has no column " + column);
+    throw UException("table " + name_ + " has no column " + std::string(column));
   }
   const Row& row = ligne();
   if (*i < row.values.size()) return row.values[*i];
   return defaultOf(s.schema().columns()[*i].kind);
 }
 
-bool Table::ecrire(const std::string& column, const Valeur& value) {
+bool Table::ecrire(std::string_view column, const Valeur& value) {
   TableStore& s = store();
   auto i = s.schema().index(column);
   if (!i) {
     if (!s.extensible()) return false;
-    i = s.schema().add({column, colKindOfValue(value.kind())});
+    i = s.schema().add({std::string(column), colKindOfValue(value.kind())});
   }
   auto fitted = fitColumn(s.schema().columns()[*i], value);
   if (!fitted) return false;

@@ -12,6 +12,7 @@
 
 #include <filesystem>
 #include <string>
+#include <string_view>
 #include <vector>
 
 #include "host/table/Store.h"
@@ -68,10 +69,10 @@ class Table {
   int aller(RowId id);
 
   bool courante() const { return current_ != 0 || isRecord_; }
-  Valeur valeur(const std::string& column);
+  Valeur valeur(std::string_view column);
   // Writes into the current row buffer, converted to the column's kind; false when it does not
   // convert or the column does not exist.
-  bool ecrire(const std::string& column, const Valeur& value);
+  bool ecrire(std::string_view column, const Valeur& value);
   const Row& ligne();
 
   TableStore& store();

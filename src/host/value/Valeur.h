@@ -10,6 +10,7 @@
 #include <cstdint>
 #include <optional>
 #include <string>
+#include <string_view>
 #include <variant>
 
 #include "host/value/Date.h"
@@ -44,6 +45,16 @@ class Valeur {
   float asSimple() const;
   const Date& asDate() const;
   Monnaie asMonnaie() const;
+
+  // Makes the value the text `text`, reusing the storage of a text it already holds: rows read
+  // again and again into the same cursor do not allocate.
+  void assignerChaine(std::string_view text) {
+    if (auto* s = std::get_if<std::string>(&value_)) {
+      s->assign(text);
+    } else {
+      value_.emplace<std::string>(text);
+    }
+  }
 
   // Display text: "12", "1.5", "0.1", "dd/mm/yyyy" (or "" for the empty date), "12.50".
   std::string toChaine() const;
