@@ -10,7 +10,6 @@
 #include <deque>
 #include <filesystem>
 #include <functional>
-#include <map>
 #include <memory>
 #include <string>
 #include <unordered_map>
@@ -81,7 +80,7 @@ class Session {
   std::string company_;
   std::string user_;
   std::filesystem::path dataDir_ = "db";
-  std::map<std::string, std::unique_ptr<MemoryStore>> memory_;
+  std::unordered_map<std::string, std::unique_ptr<MemoryStore>> memory_;
   std::deque<std::function<void()>> pending_;
   std::vector<AutomatePtr> windows_;
   bool running_ = false;

@@ -5,6 +5,7 @@
 #include <algorithm>
 #include <atomic>
 #include <cctype>
+#include <map>
 #include <condition_variable>
 #include <mutex>
 #include <stop_token>

@@ -19,7 +19,6 @@
 #pragma once
 
 #include <cstdint>
-#include <map>
 #include <memory>
 #include <unordered_map>
 
@@ -81,7 +80,7 @@ class SqliteDatabase : public Database {
   int depth_ = 0;
   int64_t dataVersion_ = -1;
   std::unordered_map<std::string, sqlite3_stmt*> statements_;
-  std::map<std::string, std::unique_ptr<SqliteStore>> stores_;
+  std::unordered_map<std::string, std::unique_ptr<SqliteStore>> stores_;
 };
 
 }  // namespace quarvo::host
