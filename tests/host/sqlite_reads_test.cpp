@@ -122,6 +122,62 @@ TEST_F(SqliteReadsTest, AnUpdateWritesOnlyTheColumnsItChanged) {
   EXPECT_EQ(t_.value("T_TEST", "N", "IDENT", "01"), "3");
 }
 
+// Inside a transaction an update of a remembered row waits in memory: every read must see it
+// all the same (cursors, SQL selections and counts, scripts, triggers of other tables), a
+// rolled-back savepoint must drop it, and the commit must write it.
+TEST_F(SqliteReadsTest, UpdatesHeldInMemoryAreSeenByEveryReadAndDroppedByARollback) {
+  t_.sql(R"(CREATE TABLE "T_COPIE" ("IDENT" TEXT, "COPIE" INTEGER);
+            CREATE TRIGGER "TR_T_COPIE" AFTER INSERT ON "T_COPIE" BEGIN
+              UPDATE "T_COPIE" SET "COPIE" = (SELECT "N" FROM "T_TEST" WHERE "IDENT" = '01')
+               WHERE rowid = NEW.rowid;
+            END;)");
+  auto lecteur = autre();
+  Table w(nullptr, "VOVOVA", "T_TEST", "ECRITURE");
+  auto n01 = [&] {
+    Table c(nullptr, "VOVOVA", "T_TEST", "LECTURE");
+    return c.chercher(3, "IDENT", '=', Valeur::chaine("01")) == 0 ? c.valeur("N").toChaine()
+                                                                  : std::string("-");
+  };
+  auto ecrireN = [&](int64_t n) {
+    ASSERT_EQ(w.chercher(3, "IDENT", '=', Valeur::chaine("01")), 0);
+    w.ecrire("N", Valeur::entier(n));
+    ASSERT_EQ(w.modifier(), 0);
+  };
+  {
+    Transaction tx(t_.db());
+    ecrireN(10);
+    ecrireN(11);
+    EXPECT_EQ(n01(), "11");
+    EXPECT_EQ(t_.db().store("T_TEST")->count({{"N", '=', Valeur::entier(11)}}), 1);
+    EXPECT_EQ(parNom("a"), "01:11;");
+    {
+      Transaction sp(t_.db());
+      ecrireN(20);
+      EXPECT_EQ(n01(), "20");
+    }  // the savepoint is rolled back, and the update with it
+    EXPECT_EQ(n01(), "11");
+    ecrireN(30);
+    Table copie(nullptr, "VOVOVA", "T_COPIE", "ECRITURE");
+    copie.preparer();
+    copie.ecrire("IDENT", Valeur::chaine("x"));
+    ASSERT_EQ(copie.inserer(), 0);  // its trigger reads T_TEST
+    ASSERT_EQ(copie.chercher(3, "IDENT", '=', Valeur::chaine("x")), 0);
+    EXPECT_EQ(copie.valeur("COPIE").toChaine(), "30");
+    ecrireN(40);
+    t_.sql(R"(UPDATE "T_TEST" SET "M" = "N" || '.00' WHERE "IDENT" = '01')");
+    EXPECT_EQ(t_.value("T_TEST", "M", "IDENT", "01"), "40.00");
+    ecrireN(50);
+    tx.commit();
+  }
+  EXPECT_EQ(lecteur->store("T_TEST")->count({{"N", '=', Valeur::entier(50)}}), 1);
+  {
+    Transaction tx(t_.db());
+    ecrireN(60);
+  }  // rolled back whole
+  EXPECT_EQ(n01(), "50");
+  EXPECT_EQ(lecteur->store("T_TEST")->count({{"N", '=', Valeur::entier(50)}}), 1);
+}
+
 TEST_F(SqliteReadsTest, GroupedUnitsAreWholeOrAbsentAndCommittedByGroups) {
   auto lecteur = autre();
   auto compter = [&] { return lecteur->store("T_TEST")->count({}); };

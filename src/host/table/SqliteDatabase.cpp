@@ -5,8 +5,8 @@
 #include <algorithm>
 #include <atomic>
 #include <cctype>
-#include <map>
 #include <condition_variable>
+#include <map>
 #include <mutex>
 #include <stop_token>
 #include <thread>
@@ -86,6 +86,7 @@ class SqliteStore : public TableStore {
     updateSql_ = "UPDATE " + sqlIdent(name_) + " SET " + sets + " WHERE rowid = ?";
     colonnesCritere_.assign(schema_.columns().size(), false);
     colonnesDeclencheur_.assign(schema_.columns().size(), false);
+    noterDifferables(key);
     sqlite3_stmt* tr =
         db_.prepare("SELECT sql FROM sqlite_master WHERE type = 'trigger' AND tbl_name = ?");
     Reset resetTr{tr};
@@ -93,6 +94,42 @@ class SqliteStore : public TableStore {
     while (sqlite3_step(tr) == SQLITE_ROW) {
       const unsigned char* sql = sqlite3_column_text(tr, 0);
       noterDeclencheur(sql ? reinterpret_cast<const char*>(sql) : "");
+      aDesDeclencheurs_ = true;
+    }
+  }
+
+  // The columns whose update may wait in memory (see update): those no write can make fail,
+  // being neither in the key nor in an index, in a table without CHECK constraints or
+  // generated columns. (NOT NULL cannot fail: a store never binds NULL.)
+  void noterDifferables(const std::vector<size_t>& cle) {
+    colonnesDifferables_.assign(schema_.columns().size(), true);
+    for (size_t i : cle) colonnesDifferables_[i] = false;
+    sqlite3_stmt* ix = db_.prepare(
+        "SELECT ii.name FROM pragma_index_list(?1) AS il, pragma_index_info(il.name) AS ii");
+    Reset resetIx{ix};
+    sqlite3_bind_text(ix, 1, name_.c_str(), -1, SQLITE_TRANSIENT);
+    while (sqlite3_step(ix) == SQLITE_ROW) {
+      const unsigned char* col = sqlite3_column_text(ix, 0);
+      if (col == nullptr) {
+        colonnesDifferables_.assign(schema_.columns().size(), false);  // an expression index
+        continue;
+      }
+      if (auto i = schema_.index(reinterpret_cast<const char*>(col))) {
+        colonnesDifferables_[*i] = false;
+      }
+    }
+    sqlite3_stmt* def =
+        db_.prepare("SELECT sql FROM sqlite_master WHERE type = 'table' AND name = ?");
+    Reset resetDef{def};
+    sqlite3_bind_text(def, 1, name_.c_str(), -1, SQLITE_TRANSIENT);
+    std::string sql;
+    if (sqlite3_step(def) == SQLITE_ROW && sqlite3_column_text(def, 0) != nullptr) {
+      sql = reinterpret_cast<const char*>(sqlite3_column_text(def, 0));
+    }
+    for (char& c : sql) c = static_cast<char>(std::toupper(static_cast<unsigned char>(c)));
+    if (sql.empty() || sql.find("CHECK") != std::string::npos ||
+        sql.find("GENERATED") != std::string::npos || sql.find(" AS (") != std::string::npos) {
+      colonnesDifferables_.assign(schema_.columns().size(), false);
     }
   }
 
@@ -133,11 +170,33 @@ class SqliteStore : public TableStore {
     }
   }
 
-  // Forgets every remembered selection and row.
+  // Forgets every remembered selection and row; updates still waiting are written first.
   void oublier() {
+    ecrireEnAttente();
     selections_.clear();
     lignes_.clear();
   }
+
+  // Writes the updates waiting in memory, one statement per row.
+  void ecrireEnAttente() {
+    if (enAttente_.empty()) return;
+    auto lignes = std::move(enAttente_);
+    enAttente_.clear();
+    for (const auto& [id, colonnes] : lignes) {
+      auto retenue = lignes_.find(id);
+      if (retenue == lignes_.end() || !retenue->second) {
+        throw UException("update of " + name_ + " lost before it was written");  // cannot be
+      }
+      std::vector<size_t> ecrites;
+      for (size_t i = 0; i < colonnes.size(); ++i) {
+        if (colonnes[i]) ecrites.push_back(i);
+      }
+      executerUpdate(id, *retenue->second, ecrites);
+    }
+  }
+
+  // Drops the updates waiting in memory: the savepoint they belong to is rolled back.
+  void abandonnerEnAttente() { enAttente_.clear(); }
 
   bool exists() const { return !schema_.columns().empty(); }
   const std::string& name() const override { return name_; }
@@ -190,6 +249,7 @@ class SqliteStore : public TableStore {
 
   std::vector<RowId> lireSelection(const std::vector<Criterion>& criteria,
                                    const std::string& ordre) {
+    ecrireEnAttente();  // the file must hold what the cursors see
     std::vector<Valeur> binds;
     std::string sql = "SELECT rowid FROM " + sqlIdent(name_) + where(criteria, binds) + ordre;
     sqlite3_stmt* st = db_.prepare(sql);
@@ -232,6 +292,7 @@ class SqliteStore : public TableStore {
   }
 
   RowId insert(const Row& row) override {
+    avantEcriture();
     selections_.clear();  // the new row may match any of them
     if (insertSt_ == nullptr) insertSt_ = db_.prepare(insertSql_);
     sqlite3_stmt* st = insertSt_;
@@ -262,10 +323,63 @@ class SqliteStore : public TableStore {
         changeUnCritere(*retenue->second, row, ecrites)) {
       selections_.clear();
     }
+    // Inside a transaction, the update of a remembered row that fires no trigger and writes
+    // only columns no write can make fail waits in memory: a batch updates the same budget
+    // line, link and counter for every line of a piece. The remembered row takes the new
+    // values at once; the file gets them, one statement per row, at the transaction's next
+    // savepoint, release or commit, or before any statement that reads this table or may fire
+    // a trigger. A rollback drops them with the savepoint they belong to.
+    bool differe = db_.memoireActive() && !declenche && retenue != lignes_.end() &&
+                   retenue->second && retenue->second->values.size() == cols.size();
+    for (size_t i : ecrites) differe = differe && colonnesDifferables_[i];
+    if (differe) {
+      std::vector<Valeur> valeurs;
+      valeurs.reserve(ecrites.size());
+      for (size_t i : ecrites) valeurs.push_back(ajustee(row, i));
+      Row& memoire = *retenue->second;
+      std::vector<bool>& colonnes = enAttente_[id];
+      colonnes.resize(cols.size(), false);
+      for (size_t k = 0; k < ecrites.size(); ++k) {
+        memoire.values[ecrites[k]] = std::move(valeurs[k]);
+        colonnes[ecrites[k]] = true;
+      }
+      db_.noterEnAttente(this);
+      return;
+    }
+    // Written now: whatever waits is written first, so that the file sees the writes in order.
+    if (declenche) {
+      db_.ecrireEnAttente();
+    } else {
+      ecrireEnAttente();
+    }
     // The remembered row is forgotten until the write is done, then updated in place when no
     // trigger ran; otherwise it is read again on its next fetch.
+    retenue = lignes_.find(id);
     std::optional<Row> avant;
     if (retenue != lignes_.end()) avant.swap(retenue->second);
+    executerUpdate(id, row, ecrites);
+    if (avant && !declenche) {
+      for (size_t i : ecrites) avant->values[i] = ajustee(row, i);
+      retenue = lignes_.find(id);
+      if (retenue != lignes_.end()) retenue->second = std::move(avant);
+    }
+  }
+
+  // Column i of `row` in the column's kind, as it will be stored.
+  Valeur ajustee(const Row& row, size_t i) const {
+    const ColumnInfo& col = schema_.columns()[i];
+    if (i >= row.values.size()) return defaultOf(col.kind);
+    auto valeur = fitColumn(col, row.values[i]);
+    if (!valeur) {
+      throw UException("value '" + row.values[i].toChaine() + "' does not fit column " + name_ +
+                       "." + col.name);
+    }
+    return std::move(*valeur);
+  }
+
+  // UPDATE of the columns `ecrites` of row `id`, from `row`.
+  void executerUpdate(RowId id, const Row& row, const std::vector<size_t>& ecrites) {
+    const auto& cols = schema_.columns();
     sqlite3_stmt*& st = updates_[ecrites];
     if (st == nullptr) {
       if (ecrites.size() == cols.size()) {
@@ -284,19 +398,20 @@ class SqliteStore : public TableStore {
       bindColumn(st, static_cast<int>(k) + 1, row, ecrites[k]);
     sqlite3_bind_int64(st, static_cast<int>(ecrites.size()) + 1, id);
     step(st, "update of");
-    if (avant && !declenche) {
-      for (size_t i : ecrites) {
-        auto valeur = i < row.values.size() ? fitColumn(cols[i], row.values[i])
-                                            : std::optional<Valeur>(defaultOf(cols[i].kind));
-        if (!valeur) return;  // cannot happen: the bind above fitted it
-        avant->values[i] = std::move(*valeur);
-      }
-      retenue = lignes_.find(id);
-      if (retenue != lignes_.end()) retenue->second = std::move(avant);
+  }
+
+  // Before an insert or a delete: a trigger may read or write any table, so everything that
+  // waits is written; otherwise only this table's.
+  void avantEcriture() {
+    if (aDesDeclencheurs_) {
+      db_.ecrireEnAttente();
+    } else {
+      ecrireEnAttente();
     }
   }
 
   void remove(RowId id) override {
+    avantEcriture();
     selections_.clear();
     lignes_.erase(id);
     sqlite3_stmt* st = db_.prepare("DELETE FROM " + sqlIdent(name_) + " WHERE rowid = ?");
@@ -306,6 +421,7 @@ class SqliteStore : public TableStore {
   }
 
   int64_t removeAll(const std::vector<Criterion>& criteria) override {
+    avantEcriture();
     oublier();
     std::vector<Valeur> binds;
     sqlite3_stmt* st = db_.prepare("DELETE FROM " + sqlIdent(name_) + where(criteria, binds));
@@ -316,6 +432,7 @@ class SqliteStore : public TableStore {
   }
 
   int64_t count(const std::vector<Criterion>& criteria) override {
+    ecrireEnAttente();
     std::vector<Valeur> binds;
     sqlite3_stmt* st =
         db_.prepare("SELECT COUNT(*) FROM " + sqlIdent(name_) + where(criteria, binds));
@@ -542,6 +659,11 @@ class SqliteStore : public TableStore {
   std::vector<bool> colonnesCritere_;      // columns some remembered selection selects on
   std::vector<bool> colonnesDeclencheur_;  // columns whose update fires a trigger
   bool declencheTout_ = false;             // some trigger fires on any update
+  bool aDesDeclencheurs_ = false;          // the table has triggers of any kind
+  std::vector<bool> colonnesDifferables_;  // columns whose update may wait (see update)
+  // Rows updated in memory only, with the columns still to write (their remembered row holds
+  // the values).
+  std::unordered_map<RowId, std::vector<bool>> enAttente_;
 };
 
 namespace {
@@ -664,6 +786,7 @@ SqliteDatabase::SqliteDatabase(const std::filesystem::path& path, bool create, i
 
 SqliteDatabase::~SqliteDatabase() {
   checkpoint_.reset();  // before the close, which copies what is left of the log
+  enAttente_.clear();   // an open transaction is rolled back below
   stores_.clear();
   for (auto& [sql, st] : statements_) sqlite3_finalize(st);
   while (depth_ > 0) rollback();
@@ -708,6 +831,19 @@ void SqliteDatabase::pas(const std::string& sql) {
   if (sqlite3_step(st) != SQLITE_DONE) fail(sql);
 }
 
+void SqliteDatabase::noterEnAttente(SqliteStore* store) {
+  if (std::find(enAttente_.begin(), enAttente_.end(), store) == enAttente_.end()) {
+    enAttente_.push_back(store);
+  }
+}
+
+void SqliteDatabase::ecrireEnAttente() {
+  while (!enAttente_.empty()) {
+    enAttente_.back()->ecrireEnAttente();
+    enAttente_.pop_back();
+  }
+}
+
 void SqliteDatabase::oublierLectures() {
   for (auto& [name, store] : stores_) store->oublier();
 }
@@ -727,6 +863,7 @@ void SqliteDatabase::executer(const std::string& sql) {
 }
 
 void SqliteDatabase::begin() {
+  ecrireEnAttente();  // what waits belongs to the enclosing level
   if (depth_ == 0) {
     executer("BEGIN IMMEDIATE");
     // What was remembered from earlier transactions holds unless another connection has
@@ -744,6 +881,7 @@ void SqliteDatabase::begin() {
 
 void SqliteDatabase::commit() {
   if (depth_ == 0) throw UException("commit without a transaction");
+  ecrireEnAttente();
   --depth_;
   if (depth_ == 0) {
     executer("COMMIT");
@@ -754,6 +892,9 @@ void SqliteDatabase::commit() {
 
 void SqliteDatabase::rollback() {
   if (depth_ == 0) return;
+  // What waits was written after the savepoint being rolled back: it is dropped with it.
+  for (auto& [name, store] : stores_) store->abandonnerEnAttente();
+  enAttente_.clear();
   oublierLectures();  // rows read or written in the undone work are no longer true
   --depth_;
   if (depth_ == 0) {

@@ -11,7 +11,10 @@
 // answered from memory when asked again: a batch looks up the same reference rows for every
 // line. A write to a table forgets its selections (and the written row); a rollback or a script
 // forgets everything; so does a new transaction when another connection committed meanwhile.
-// Outside transactions every read goes to the file.
+// Outside transactions every read goes to the file. An update of a remembered row that fires
+// no trigger and touches no key, index or checked column is held in that row until the
+// transaction reaches its next savepoint or commit, or a statement may read the table; a
+// rollback drops it (see SqliteStore::update).
 //
 // Committed pages go to the write-ahead log; a thread of the database, with a connection of its
 // own, copies the log back into the file once it has grown past a threshold (see
@@ -62,6 +65,11 @@ class SqliteDatabase : public Database {
   // Reads may be answered from what the stores remember: only inside a transaction, where no
   // other connection can change the file.
   bool memoireActive() const { return depth_ > 0; }
+  // Updates a store holds in memory inside a transaction (see SqliteStore::update): noted by
+  // the store, written before the transaction changes level or a statement may read them,
+  // dropped by a rollback.
+  void noterEnAttente(SqliteStore* store);
+  void ecrireEnAttente();
   // Copies of the log into the file done so far by the background thread.
   int64_t checkpointsEnFond() const;
 
@@ -81,6 +89,7 @@ class SqliteDatabase : public Database {
   int64_t dataVersion_ = -1;
   std::unordered_map<std::string, sqlite3_stmt*> statements_;
   std::unordered_map<std::string, std::unique_ptr<SqliteStore>> stores_;
+  std::vector<SqliteStore*> enAttente_;  // stores holding updates not yet written
 };
 
 }  // namespace quarvo::host
