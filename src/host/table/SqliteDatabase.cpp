@@ -134,8 +134,8 @@ class SqliteStore : public TableStore {
   }
 
   // Notes which updates fire a trigger of the table: "UPDATE OF a, b" names its columns, a
-  // plain UPDATE trigger fires on any. Insert and delete triggers need nothing: inserts and
-  // deletes forget the table's selections anyway.
+  // plain UPDATE trigger fires on any. Insert and delete triggers need no columns: inserts and
+  // deletes forget the table's selections anyway, and write what waits first (ecrireAvant).
   void noterDeclencheur(std::string sql) {
     for (char& c : sql) c = static_cast<char>(std::toupper(static_cast<unsigned char>(c)));
     for (char& c : sql) {
@@ -292,7 +292,7 @@ class SqliteStore : public TableStore {
   }
 
   RowId insert(const Row& row) override {
-    avantEcriture();
+    ecrireAvant(aDesDeclencheurs_);
     selections_.clear();  // the new row may match any of them
     if (insertSt_ == nullptr) insertSt_ = db_.prepare(insertSql_);
     sqlite3_stmt* st = insertSt_;
@@ -346,12 +346,7 @@ class SqliteStore : public TableStore {
       db_.noterEnAttente(this);
       return;
     }
-    // Written now: whatever waits is written first, so that the file sees the writes in order.
-    if (declenche) {
-      db_.ecrireEnAttente();
-    } else {
-      ecrireEnAttente();
-    }
+    ecrireAvant(declenche);
     // The remembered row is forgotten until the write is done, then updated in place when no
     // trigger ran; otherwise it is read again on its next fetch.
     retenue = lignes_.find(id);
@@ -400,10 +395,11 @@ class SqliteStore : public TableStore {
     step(st, "update of");
   }
 
-  // Before an insert or a delete: a trigger may read or write any table, so everything that
-  // waits is written; otherwise only this table's.
-  void avantEcriture() {
-    if (aDesDeclencheurs_) {
+  // Before a statement that writes this table: what waits is written first, so that the file
+  // sees the writes in order; everything that waits when the statement may fire a trigger,
+  // which may read or write any table, otherwise only this table's.
+  void ecrireAvant(bool declenche) {
+    if (declenche) {
       db_.ecrireEnAttente();
     } else {
       ecrireEnAttente();
@@ -411,7 +407,7 @@ class SqliteStore : public TableStore {
   }
 
   void remove(RowId id) override {
-    avantEcriture();
+    ecrireAvant(aDesDeclencheurs_);
     selections_.clear();
     lignes_.erase(id);
     sqlite3_stmt* st = db_.prepare("DELETE FROM " + sqlIdent(name_) + " WHERE rowid = ?");
@@ -421,7 +417,7 @@ class SqliteStore : public TableStore {
   }
 
   int64_t removeAll(const std::vector<Criterion>& criteria) override {
-    avantEcriture();
+    ecrireAvant(aDesDeclencheurs_);
     oublier();
     std::vector<Valeur> binds;
     sqlite3_stmt* st = db_.prepare("DELETE FROM " + sqlIdent(name_) + where(criteria, binds));
@@ -571,22 +567,12 @@ class SqliteStore : public TableStore {
 
   // Binds column i of the row to parameter n, in its stored form.
   void bindColumn(sqlite3_stmt* st, int n, const Row& row, size_t i) {
-    const ColumnInfo& col = schema_.columns()[i];
-    if (i >= row.values.size()) {
-      bindStored(st, n, defaultOf(col.kind), SQLITE_TRANSIENT);
+    if (i < row.values.size() && row.values[i].kind() == valueKindOf(schema_.columns()[i].kind)) {
+      // Already of the column's kind, as cursors write values.
+      bindStored(st, n, row.values[i], SQLITE_STATIC);
       return;
     }
-    const Valeur& v = row.values[i];
-    if (v.kind() == valueKindOf(col.kind)) {
-      bindStored(st, n, v, SQLITE_STATIC);  // already of the column's kind, as cursors write values
-      return;
-    }
-    auto fitted = fitColumn(col, v);
-    if (!fitted) {
-      throw UException("value '" + v.toChaine() + "' does not fit column " + name_ + "." +
-                       col.name);
-    }
-    bindStored(st, n, *fitted, SQLITE_TRANSIENT);
+    bindStored(st, n, ajustee(row, i), SQLITE_TRANSIENT);
   }
 
   // Binds a value of its column's kind as it is stored (see storageForm). With SQLITE_STATIC a

@@ -50,54 +50,33 @@ struct DifferencesGeneration {
   Solde solde;          // settling when the staged "SOLDE" is 1
 };
 
-inline constexpr DifferencesGeneration kGenerationDf{"DF",
-                                                     "IMM_PIECE_DF",
-                                                     "GAPEDEV",
-                                                     false,
-                                                     false,
-                                                     false,
-                                                     DifferencesGeneration::Montants::Aucun,
-                                                     false,
-                                                     false,
-                                                     false,
-                                                     false,
-                                                     DifferencesGeneration::Solde::Toujours};
-inline constexpr DifferencesGeneration kGenerationCf{"CF",
-                                                     "IMM_PIECE_CF",
-                                                     "GAPECOM",
-                                                     true,
-                                                     false,
-                                                     true,
-                                                     DifferencesGeneration::Montants::Engage,
-                                                     true,
-                                                     false,
-                                                     false,
-                                                     false,
-                                                     DifferencesGeneration::Solde::SaufSoldee};
-inline constexpr DifferencesGeneration kGenerationBf{"BF",
-                                                     "IMM_PIECE_BF",
-                                                     "GAPEBL",
-                                                     true,
-                                                     false,
-                                                     true,
-                                                     DifferencesGeneration::Montants::Aucun,
-                                                     false,
-                                                     false,
-                                                     false,
-                                                     false,
-                                                     DifferencesGeneration::Solde::SaufSoldee};
-inline constexpr DifferencesGeneration kGenerationFf{"FF",
-                                                     "IMM_PIECE_FF",
-                                                     "GAPEFAC",
-                                                     true,
-                                                     true,
-                                                     true,
-                                                     DifferencesGeneration::Montants::Realise,
-                                                     false,
-                                                     true,
-                                                     true,
-                                                     true,
-                                                     DifferencesGeneration::Solde::Jamais};
+// One kind per entry, its fields named.
+// clang-format off
+inline constexpr DifferencesGeneration kGenerationDf{
+    .code = "DF", .staging = "IMM_PIECE_DF", .entete = "GAPEDEV",
+    .moisSociete = false, .avoirs = false, .majLigne = false,
+    .montants = DifferencesGeneration::Montants::Aucun,
+    .resultats = false, .calculRaf = false, .numeroEntete = false, .echeances = false,
+    .solde = DifferencesGeneration::Solde::Toujours};
+inline constexpr DifferencesGeneration kGenerationCf{
+    .code = "CF", .staging = "IMM_PIECE_CF", .entete = "GAPECOM",
+    .moisSociete = true, .avoirs = false, .majLigne = true,
+    .montants = DifferencesGeneration::Montants::Engage,
+    .resultats = true, .calculRaf = false, .numeroEntete = false, .echeances = false,
+    .solde = DifferencesGeneration::Solde::SaufSoldee};
+inline constexpr DifferencesGeneration kGenerationBf{
+    .code = "BF", .staging = "IMM_PIECE_BF", .entete = "GAPEBL",
+    .moisSociete = true, .avoirs = false, .majLigne = true,
+    .montants = DifferencesGeneration::Montants::Aucun,
+    .resultats = false, .calculRaf = false, .numeroEntete = false, .echeances = false,
+    .solde = DifferencesGeneration::Solde::SaufSoldee};
+inline constexpr DifferencesGeneration kGenerationFf{
+    .code = "FF", .staging = "IMM_PIECE_FF", .entete = "GAPEFAC",
+    .moisSociete = true, .avoirs = true, .majLigne = true,
+    .montants = DifferencesGeneration::Montants::Realise,
+    .resultats = false, .calculRaf = true, .numeroEntete = true, .echeances = true,
+    .solde = DifferencesGeneration::Solde::Jamais};
+// clang-format on
 
 class QUARVOImport_generer : public host::Parcours {
  public:
