@@ -22,15 +22,6 @@ constexpr const char* kColonnesLigne[] = {
     "GCPARTIC_IDENT", "GCPARTIC_CODE",  "DESIG",      "QTE",          "PUHT",
     "TAUX_REMISE",    "GCPDEPOT_IDENT", "SECAN_CODE", "GCPTVA_IDENT", "STYLE"};
 
-std::string heureCourante() {
-  std::time_t t = std::time(nullptr);
-  std::tm local{};
-  localtime_r(&t, &local);
-  char buf[16];
-  std::strftime(buf, sizeof buf, "%H:%M:%S", &local);
-  return buf;
-}
-
 }  // namespace
 
 PieceGeneration::PieceGeneration(Evt* evt) : TableInterface(evt) {
@@ -135,8 +126,7 @@ void PieceGeneration::debutPieceGeneree(Evt* evt) {
     bool avoir = evt->nbParams() > 7 && toEntier(evt->valeur(7)) == 1;
     piece.ecrire("TYPE", Valeur::chaine(avoir ? "A" : "F"));
   }
-  piece.ecrire("DATE_MAJ", Valeur::date(Date::today()));
-  piece.ecrire("HEURE_MAJ", Valeur::chaine(heureCourante()));
+  horodater(piece);
   piece.ecrire("VALIDEE", Valeur::entier(0));
   if (piece.inserer() != 0) {
     echec(evt, "La pièce " + nouveau + " n'a pas pu être enregistrée.");

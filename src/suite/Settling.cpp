@@ -71,6 +71,7 @@ void Gcpfour::soldePiece(Evt* evt) {
   piece->ecrire("SOLDEE", Valeur::entier(1));
   piece->ecrire("MTNT_HT", Valeur::monnaie(toMonnaie(evt->valeur(2))));
   piece->ecrire("MTNT_TTC", Valeur::monnaie(toMonnaie(evt->valeur(3))));
+  horodater(*piece);  // a settled piece has changed: its links no longer say what it is
   erreurMethode(piece->modifier(), evt);
 }
 

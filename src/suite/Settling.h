@@ -5,8 +5,9 @@
 // ("GAPECOM"/"GAPLCOM"), -3 goods-received note ("GAPEBL"/"GAPLBL"), -4 invoice:
 // - "GCPFOUR" (besides the generic reads): "DEBUT_SOLDE" (type, supplier) fails when the
 //   supplier does not exist. "SOLDE_PIECE" (type, piece, HT, TTC) marks the header settled:
-//   "SOLDEE" = 1 and the settled amounts "MTNT_HT"/"MTNT_TTC" = the two amounts; it fails when
-//   the piece does not exist. "FIN_SOLDE" succeeds.
+//   "SOLDEE" = 1 and the settled amounts "MTNT_HT"/"MTNT_TTC" = the two amounts, and renews its
+//   update stamp ("DATE_MAJ", "HEURE_MAJ"); it fails when the piece does not exist. "FIN_SOLDE"
+//   succeeds.
 // - "GCPSTOCK": "DEBUT_SOLDE" (type) remembers the type for the session; "SOLDE_LIGNE"
 //   (article, depot, quantity) lowers the expected quantity "QTE_ATTENDUE" of the article in
 //   that depot by the quantity (never below 0) when an order is being settled; other kinds and

@@ -1,11 +1,23 @@
 #include "suite/TableInterface.h"
 
+#include <ctime>
+
 #include "host/session/Session.h"
 #include "host/table/Table.h"
 
 namespace quarvo::suite {
 
 using namespace host;
+
+void horodater(Table& piece) {
+  std::time_t t = std::time(nullptr);
+  std::tm local{};
+  localtime_r(&t, &local);
+  char heure[16];
+  std::strftime(heure, sizeof heure, "%H:%M:%S", &local);
+  piece.ecrire("DATE_MAJ", Valeur::date(Date::today()));
+  piece.ecrire("HEURE_MAJ", Valeur::chaine(heure));
+}
 
 TableInterface::TableInterface(Evt* evt) : Interface2(evt) {
   addBranch("INIT", [this](Evt* e) { init(e); });

@@ -13,6 +13,11 @@
 
 namespace quarvo::suite {
 
+// Stamps the current row of a purchasing piece's header with the day and time of its change
+// ("DATE_MAJ", "HEURE_MAJ"): a linked piece whose stamp differs from its links' has changed since
+// it was linked. Writes the row's columns, not the database.
+void horodater(host::Table& piece);
+
 class TableInterface : public host::Interface2 {
  public:
   bool reutilisable() const override { return true; }  // keeps nothing between calls

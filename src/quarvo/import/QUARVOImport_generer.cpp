@@ -4,6 +4,7 @@
 #include <cstdlib>
 
 #include "host/session/Session.h"
+#include "quarvo/frame/Apports.h"
 #include "quarvo/frame/Keys.h"
 #include "quarvo/import/ImportOutils.h"
 
@@ -136,6 +137,7 @@ void QUARVOImport_generer::debut(Evt* evt) {
     vMo_.set(import::caracteres(moisAnnee, 1, 2));
     vAn_.set(import::caracteres(moisAnnee, 3, 6));
     vAnmo_.set(vAn_.text() + vMo_.text());
+    receptions_ = iAfsoci_.valeur("OPTION9").toChaine() == "O";
   }
   EvtParamVal machat{val("MACHAT")};
   bool parametreLu = appeler("AFPARA", "LECTURE_CODE", machat, "*1");
@@ -181,6 +183,7 @@ void QUARVOImport_generer::debut(Evt* evt) {
 
 void QUARVOImport_generer::abandonnerPiece() {
   piece_.reset();  // rolls back everything written for the piece
+  liens_.clear();
   vCreerPiece_.set("0");
   vPieceIdent_.set("");
 }
@@ -191,6 +194,8 @@ void QUARVOImport_generer::debut1(Evt*) {
   if (lot_) lot_->uniteTerminee();  // the previous piece has ended
   vCreerPiece_.set("1");
   vPieceIdent_.set("");
+  liens_.clear();
+  rang_ = 0;
   std::string numero = staged("NUMERO_DOC");
   if (pieces_.chercher(3, "NUMERO_DOC", '=', Valeur::chaine(numero)) == 0) {
     // Generated before (by an earlier run): kept as it is, only settled when asked.
@@ -220,10 +225,6 @@ void QUARVOImport_generer::debut1(Evt*) {
   if (!protocole("DEBUT_PIECE_GENEREE", debutPiece)) {
     abandonnerPiece();
     return;
-  }
-  if (pieces_.chercher(3, "IDENT", '=', vPieceIdent_.value()) == 0) {
-    dateMaj_ = pieces_.valeur("DATE_MAJ");
-    heureMaj_ = pieces_.valeur("HEURE_MAJ");
   }
 }
 
@@ -291,6 +292,7 @@ void QUARVOImport_generer::pour_tout(Evt*) {
     jauge();
     return;
   }
+  ++rang_;
   if (kind_.majLigne) appelerProcedure("", "", "", "MAJ_LIGNE", &none, 0);
   if (limite_ >= 0 && piecesEcrites >= limite_) std::_Exit(75);
   jauge();
@@ -305,97 +307,133 @@ void QUARVOImport_generer::maj_ligne(Evt*) {
   // The service comes by its identifier (read by code it would never be found).
   EvtParamVal service{Arg(vPrestationIdent_.value())};
   if (vPrestationIdent_.text().empty() || !appeler("AFPRES", "LECTURE", service, "*1")) return;
-
-  vQte_.assign(stagedValeur("QTE"));
-  vHt_.set(valeurArrondie(toMonnaie(stagedValeur("PUHT")) * vQte_.dbl(), 2, '='));
-  if (vAvoir_.entier() == 1) {
-    vQte_.set(-vQte_.dbl());
-    vHt_.set(-vHt_.monnaie());
-  }
-
   if (afebud_.chercher(3, "CLE_COMPO2", '=', Valeur::chaine(affaire + "|" + budget)) != 0) return;
-  std::string budgetIdent = afebud_.valeur("IDENT").toChaine();
 
+  // The line is booked with its piece, once the piece is complete and settled: its net amount
+  // and what settling leaves of it are known only then. Lines of one service in one budget
+  // share one budget line and one link row.
+  std::string budgetIdent = afebud_.valeur("IDENT").toChaine();
+  std::string numero = frame::numeroLigne(vPieceIdent_.text(), std::to_string(rang_));
+  for (auto& lien : liens_) {
+    if (lien.budget == budgetIdent && lien.service == vPrestationIdent_.text()) {
+      lien.lignes.push_back(numero);
+      return;
+    }
+  }
+  LienAReporter lien;
+  lien.budget = budgetIdent;
+  lien.service = vPrestationIdent_.text();
+  for (const char* c : {"AFAFFA_IDENT", "AFAFFA_CODE", "PIECE", "DATE_DEBUT", "DATE_FIN"}) {
+    lien.budgetRow.emplace_back(c, afebud_.valeur(c));
+  }
+  for (const char* c : {"IDENT", "CODE"}) lien.projet.emplace_back(c, iAfaffa_.valeur(c));
+  for (const char* c : {"IDENT", "CODE", "DESIG", "UNITE", "POSTE_ACHAT"}) {
+    lien.prestation.emplace_back(c, iAfpres_.valeur(c));
+  }
+  lien.lignes.push_back(numero);
+  liens_.push_back(std::move(lien));
+}
+
+namespace {
+
+Valeur colonne(const std::vector<std::pair<std::string, Valeur>>& row, const char* name) {
+  for (const auto& [column, value] : row) {
+    if (column == name) return value;
+  }
+  return Valeur();
+}
+
+}  // namespace
+
+bool QUARVOImport_generer::numeroter(const char* table, Field& ident) {
+  ident.set("");
+  EvtParamRef attribue{val("VOVOVA"), val("NUMEROS"), val(table), val(""), val(10), ref(ident)};
+  if (!appeler("ZUMNDOC", "ATTRIBUE_NUMERO", attribue)) return false;
+  EvtParamRef valide{val("VOVOVA"), val("NUMEROS"), val(table), val(""), val(10), ref(ident)};
+  return appeler("ZUMNDOC", "VALIDE_NUMERO", valide);
+}
+
+void QUARVOImport_generer::reporterSurBudgets() {
+  if (liens_.empty()) return;
+  if (pieces_.chercher(3, "IDENT", '=', vPieceIdent_.value()) != 0) return;
+  auto colonneEntete = [this](const std::string& c) { return pieces_.valeur(c); };
+  frame::EnteteAchat entete = frame::enteteAchat(kind_.entete, colonneEntete);
+  Valeur dateMaj = pieces_.valeur("DATE_MAJ");
+  Valeur heureMaj = pieces_.valeur("HEURE_MAJ");
+  Table lignes(this, "GESCOM", kind_.lignes, "LIGNES_PIECE");
+  auto colonneLigne = [&lignes](const std::string& c) { return lignes.valeur(c); };
+  for (const auto& lien : liens_) {
+    double qte = 0;
+    double qtt = 0;
+    Monnaie ht;
+    bool lie = false;
+    for (const auto& numero : lien.lignes) {
+      if (lignes.chercher(3, "NUMERO", '=', Valeur::chaine(numero)) != 0) continue;
+      frame::ApportLigne apport = frame::apportLigne(entete, frame::ligneAchat(colonneLigne));
+      if (apport.qte == 0) continue;  // nothing left of the line: linked to nothing
+      qte += apport.qte;
+      qtt += apport.qtt;
+      ht += apport.ht;
+      lie = true;
+    }
+    if (!lie) continue;
+    vQte_.set(qte);
+    vHt_.set(ht);
+    reporterLien(lien, qtt, dateMaj, heureMaj);
+  }
+}
+
+void QUARVOImport_generer::reporterLien(const LienAReporter& lien, double qtt,
+                                        const Valeur& dateMaj, const Valeur& heureMaj) {
   aflbud_.effacerCriteres();
-  aflbud_.ajouterCritere("NUMERO", '/', Valeur::chaine(budgetIdent + "|"), 'R');
+  aflbud_.ajouterCritere("NUMERO", '/', Valeur::chaine(lien.budget + "|"), 'R');
   aflbud_.ouvrir();
   vCreerAflbud_.set(int64_t{1});
   while (aflbud_.lire(1, 'A') == 0) {
-    if (aflbud_.valeur("AFPRES_IDENT").toChaine() == vPrestationIdent_.text()) {
+    if (aflbud_.valeur("AFPRES_IDENT").toChaine() == lien.service) {
       vCreerAflbud_.set(int64_t{0});
       break;
     }
   }
   if (vCreerAflbud_.entier() == 1) {
     Field& ident = chaine("V_AFLBUD_IDENT");
-    EvtParamRef attribue{val("VOVOVA"), val("NUMEROS"), val("AFLBUD"),
-                         val(""),       val(10),        ref(ident)};
-    if (!appeler("ZUMNDOC", "ATTRIBUE_NUMERO", attribue)) return;
-    EvtParamRef valide{val("VOVOVA"), val("NUMEROS"), val("AFLBUD"), val(""), val(10), ref(ident)};
-    if (!appeler("ZUMNDOC", "VALIDE_NUMERO", valide)) return;
+    if (!numeroter("AFLBUD", ident)) return;
     aflbud_.preparer();
     aflbud_.ecrire("IDENT", ident.value());
-    aflbud_.ecrire("NUMERO", Valeur::chaine(budgetIdent + "|"));
-    aflbud_.ecrire("AFAFFA_IDENT", afebud_.valeur("AFAFFA_IDENT"));
-    aflbud_.ecrire("AFAFFA_CODE", afebud_.valeur("AFAFFA_CODE"));
-    aflbud_.ecrire("AFEBUD_PIECE", afebud_.valeur("PIECE"));
-    aflbud_.ecrire("AFPRES_IDENT", iAfpres_.valeur("IDENT"));
-    aflbud_.ecrire("AFPRES_CODE", iAfpres_.valeur("CODE"));
-    aflbud_.ecrire("DESIG", iAfpres_.valeur("DESIG"));
-    aflbud_.ecrire("UNITE", iAfpres_.valeur("UNITE"));
-    aflbud_.ecrire("DATE_DEBUT", afebud_.valeur("DATE_DEBUT"));
-    aflbud_.ecrire("DATE_FIN", afebud_.valeur("DATE_FIN"));
+    aflbud_.ecrire("NUMERO", Valeur::chaine(lien.budget + "|"));
+    aflbud_.ecrire("AFAFFA_IDENT", colonne(lien.budgetRow, "AFAFFA_IDENT"));
+    aflbud_.ecrire("AFAFFA_CODE", colonne(lien.budgetRow, "AFAFFA_CODE"));
+    aflbud_.ecrire("AFEBUD_PIECE", colonne(lien.budgetRow, "PIECE"));
+    aflbud_.ecrire("AFPRES_IDENT", colonne(lien.prestation, "IDENT"));
+    aflbud_.ecrire("AFPRES_CODE", colonne(lien.prestation, "CODE"));
+    aflbud_.ecrire("DESIG", colonne(lien.prestation, "DESIG"));
+    aflbud_.ecrire("UNITE", colonne(lien.prestation, "UNITE"));
+    aflbud_.ecrire("DATE_DEBUT", colonne(lien.budgetRow, "DATE_DEBUT"));
+    aflbud_.ecrire("DATE_FIN", colonne(lien.budgetRow, "DATE_FIN"));
     aflbud_.ecrire("APPRO", Valeur::chaine("A"));
-  }
-
-  Champ veng("VENG", aflbud_);
-  Champ vrea("VREA", aflbud_);
-  Champ vraf("VRAF", aflbud_);
-  if (kind_.montants == Montants::Engage) {
-    veng.set(veng.monnaie() + vHt_.monnaie());
-  } else if (kind_.montants == Montants::Realise) {
-    Monnaie realise = vrea.at(0) + vHt_.monnaie();
-    for (size_t i = 0; i < 3; ++i) vrea.setAt(i, realise);
-    Monnaie budgete = toMonnaie(aflbud_.valeur("VBUD_D"));
-    Monnaie reste = budgete - realise;
-    if (reste < Monnaie()) reste = Monnaie();
-    for (size_t i = 0; i < 3; ++i) vraf.setAt(i, reste);
-    double hbud = toDouble(aflbud_.valeur("HBUD"));
-    double avancement = 0;
-    if (hbud != 0) {
-      avancement = (hbud - toDouble(aflbud_.valeur("HRAF"))) / hbud * 100;
-    } else if (!budgete.isZero()) {
-      avancement = ((budgete - reste) / budgete).toDouble() * 100;
-    }
-    aflbud_.ecrire("AVT", Valeur::dbl(std::clamp(avancement, 0.0, 100.0)));
-  }
-  if (vCreerAflbud_.entier() == 1) {
-    aflbud_.inserer();
-  } else {
-    aflbud_.modifier();
+    if (aflbud_.inserer() != 0) return;
   }
   std::string ligneIdent = aflbud_.valeur("IDENT").toChaine();
 
   std::string cle = frame::cleCompo(ligneIdent, kind_.entete, staged("NUMERO_DOC"));
-  if (quarvo_.chercher(3, "CLE_COMPO", '=', Valeur::chaine(cle)) != 0) {
+  frame::ApportLien avant;
+  if (quarvo_.chercher(3, "CLE_COMPO", '=', Valeur::chaine(cle)) == 0) {
+    avant = frame::apportLien(quarvo_, receptions_);
+  } else {
     Field& ident = chaine("V_QUARVO_IDENT");
-    EvtParamRef attribue{val("VOVOVA"), val("NUMEROS"), val("QUARVO"),
-                         val(""),       val(10),        ref(ident)};
-    if (!appeler("ZUMNDOC", "ATTRIBUE_NUMERO", attribue)) return;
-    EvtParamRef valide{val("VOVOVA"), val("NUMEROS"), val("QUARVO"), val(""), val(10), ref(ident)};
-    if (!appeler("ZUMNDOC", "VALIDE_NUMERO", valide)) return;
+    if (!numeroter("QUARVO", ident)) return;
     quarvo_.preparer();
     quarvo_.ecrire("IDENT", ident.value());
-    quarvo_.ecrire("AFEBUD_IDENT", Valeur::chaine(budgetIdent));
-    quarvo_.ecrire("AFAFFA_IDENT", iAfaffa_.valeur("IDENT"));
-    quarvo_.ecrire("AFAFFA_CODE", iAfaffa_.valeur("CODE"));
+    quarvo_.ecrire("AFEBUD_IDENT", Valeur::chaine(lien.budget));
+    quarvo_.ecrire("AFAFFA_IDENT", colonne(lien.projet, "IDENT"));
+    quarvo_.ecrire("AFAFFA_CODE", colonne(lien.projet, "CODE"));
     quarvo_.ecrire("AFLBUD_IDENT", Valeur::chaine(ligneIdent));
     quarvo_.ecrire("COMPOSANT", Valeur::chaine(kind_.entete));
     quarvo_.ecrire("COMPOSANT_IDENT", vPieceIdent_.value());
     quarvo_.ecrire("PIECE", stagedValeur("NUMERO_DOC"));
     quarvo_.ecrire("DATE_PIECE", stagedValeur("DATE_CREATION"));
-    quarvo_.ecrire("DATE_MAJ", dateMaj_);
-    quarvo_.ecrire("HEURE_MAJ", heureMaj_);
+    quarvo_.ecrire("DATE_MAJ", dateMaj);
+    quarvo_.ecrire("HEURE_MAJ", heureMaj);
     quarvo_.ecrire("CLE_COMPO", Valeur::chaine(cle));
     quarvo_.ecrire("CLE_COMPO2",
                    Valeur::chaine(frame::cleCompo2(kind_.entete, vPieceIdent_.text())));
@@ -403,7 +441,19 @@ void QUARVOImport_generer::maj_ligne(Evt*) {
   }
   quarvo_.ecrire("QTE", Valeur::dbl(toDouble(quarvo_.valeur("QTE")) + vQte_.dbl()));
   quarvo_.ecrire("HT", Valeur::monnaie(toMonnaie(quarvo_.valeur("HT")) + vHt_.monnaie()));
+  quarvo_.ecrire("QTT", Valeur::dbl(toDouble(quarvo_.valeur("QTT")) + qtt));
   quarvo_.modifier();
+  frame::ApportLien apres = frame::apportLien(quarvo_, receptions_);
+
+  // The budget line takes what the link row now books, less what it booked before.
+  Champ veng("VENG", aflbud_);
+  Champ vrea("VREA", aflbud_);
+  Monnaie engage = apres.engage - avant.engage;
+  Monnaie realise = apres.realise - avant.realise;
+  veng.set(veng.monnaie() + engage);
+  for (size_t i = 0; i < 3; ++i) vrea.setAt(i, vrea.at(i) + realise);
+  frame::restesEtAvancement(aflbud_);
+  aflbud_.modifier();
 
   if (kind_.resultats) {
     std::string datePiece = quarvo_.valeur("DATE_PIECE").toChaine();
@@ -412,21 +462,32 @@ void QUARVOImport_generer::maj_ligne(Evt*) {
     vAnmo_.set(vAn_.text() + vMo_.text());
     Table resu(this, "", "M_RESU1", "");
     resu.preparer();
-    resu.ecrire("AFAFFA_IDENT", iAfaffa_.valeur("IDENT"));
-    resu.ecrire("AFPOST_CODE", iAfpres_.valeur("POSTE_ACHAT"));
+    resu.ecrire("AFAFFA_IDENT", colonne(lien.projet, "IDENT"));
+    resu.ecrire("AFPOST_CODE", colonne(lien.prestation, "POSTE_ACHAT"));
     resu.ecrire("ANNEE_MOIS", vAnmo_.value());
     resu.ecrire("TYPE", Valeur::chaine("D"));
-    resu.ecrire("VENG", Valeur::monnaie(-vHt_.monnaie()));
+    resu.ecrire("VENG", Valeur::monnaie(-engage));
     resu.inserer();
     EvtParamVal none;
     appeler("AFRESU", "MAJ_AFRESU", none);
   }
   if (kind_.calculRaf) {
-    pAffa_.assign(iAfaffa_.valeur("IDENT"));
-    pPost_.assign(iAfpres_.valeur("POSTE_ACHAT"));
+    pAffa_.assign(colonne(lien.projet, "IDENT"));
+    pPost_.assign(colonne(lien.prestation, "POSTE_ACHAT"));
     pAnmo_.assign(vAnmo_.value());
     EvtParamRef raf{ref(pAffa_), ref(pPost_), ref(pAnmo_)};
     appeler("AFRESU", "CALCUL_RAF_D", raf);
+  }
+  // A receipt that books on the realised amounts has its accounting movement, as when it is
+  // linked by hand or by the imputation (invoices get theirs with the piece).
+  if (kind_.entete == std::string("GAPEBL") && !realise.isZero()) {
+    EvtParamVal lecture{val(kind_.entete), vPieceIdent_.value()};
+    if (!appeler("AFMOUV", "LECTURE_CLE_COMPO", lecture)) {
+      EvtParamVal genere{val(kind_.entete), vPieceIdent_.value()};
+      appeler("AFMOUV", "GENERER_PIECE", genere);
+      EvtParamVal maj{val(kind_.entete), vPieceIdent_.value()};
+      appeler("AFMOUV", "MAJ_PIECE_GENEREE", maj);
+    }
   }
 }
 
@@ -518,13 +579,15 @@ void QUARVOImport_generer::fin1(Evt*) {
   }
   EvtParamVal valide{pieces_.valeur("IDENT")};
   if (!protocole("VALIDE_DOCUMENT", valide)) return abandonnerPiece();
+  solder();
+  reporterSurBudgets();
   if (kind_.echeances) {
-    EvtParamVal mouvement{val(kind_.entete), pieces_.valeur("IDENT")};
+    // The movement takes its amount from the piece's link rows: written after them.
+    EvtParamVal mouvement{val(kind_.entete), vPieceIdent_.value()};
     appeler("AFMOUV", "GENERER_PIECE", mouvement);
-    EvtParamVal maj{val(kind_.entete), pieces_.valeur("IDENT")};
+    EvtParamVal maj{val(kind_.entete), vPieceIdent_.value()};
     appeler("AFMOUV", "MAJ_PIECE_GENEREE", maj);
   }
-  solder();
   if (piece_) {
     piece_->commit();
     piece_.reset();

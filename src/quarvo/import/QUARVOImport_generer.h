@@ -4,13 +4,16 @@
 // The staged rows are read in piece-number order, one piece per "NUMERO_DOC". Each piece whose
 // number does not exist yet in the kind's header table is created through the purchasing
 // module's generation protocol (one "LIGNE_COPIEE" per staged line, fed through the exchange
-// record "M_GENERE"), completed (reference, origin, number, requester), validated and, for
-// orders, receipts and invoices, booked on the project budget line by line: the budget line of
-// the line's service is found or created, its figures updated (orders: committed amount;
-// invoices: realised and remaining amounts and progress) and the link row between budget line
-// and piece is found or created and accumulated. Quote requests, orders and receipts marked
-// "SOLDE" 1 are then settled ("QUARVO-SOLDER"); invoices get their due dates and project
-// movements.
+// record "M_GENERE"), completed (reference, origin, number, requester), validated, settled when
+// asked (quote requests, orders and receipts marked "SOLDE" 1, through "QUARVO-SOLDER") and, for
+// orders, receipts and invoices, booked on the project budget: each line's budget line is found
+// from its staged budget and its article's service ("MAJ_LIGNE"), and when the piece is complete
+// the lines of one budget line are linked to it through one link row, found or created, with
+// what they contribute by the rule every linking path shares (quarvo/frame/Apports.h): net of
+// discounts, less what settling closed; the budget line, found or created, takes what the link
+// row books (orders: committed amount; invoices, and receipts when the company books them:
+// realised amounts), and its remaining figures follow unless they are set by hand. Invoices then
+// get their due dates and project movements.
 //
 // Each new piece is one transaction: its header, lines, budget booking, link rows, due dates
 // and settling are written whole or not at all. Pieces are committed by groups (a piece is a
@@ -25,6 +28,8 @@
 
 #include <memory>
 #include <string>
+#include <utility>
+#include <vector>
 
 #include "host/automate/Parcours.h"
 #include "host/table/Champ.h"
@@ -39,6 +44,7 @@ struct DifferencesGeneration {
   const char* code;     // "DF", "CF", "BF", "FF"
   const char* staging;  // staging table
   const char* entete;   // piece header table, also the piece module and the link component
+  const char* lignes;   // piece line table
   bool moisSociete;     // the company's current month is read (V_ANMO)
   bool avoirs;          // staged "TYPE" 'A' makes a credit note, booked negatively
   bool majLigne;        // lines are booked on the budget ("MAJ_LIGNE")
@@ -53,25 +59,25 @@ struct DifferencesGeneration {
 // One kind per entry, its fields named.
 // clang-format off
 inline constexpr DifferencesGeneration kGenerationDf{
-    .code = "DF", .staging = "IMM_PIECE_DF", .entete = "GAPEDEV",
+    .code = "DF", .staging = "IMM_PIECE_DF", .entete = "GAPEDEV", .lignes = "GAPLDEV",
     .moisSociete = false, .avoirs = false, .majLigne = false,
     .montants = DifferencesGeneration::Montants::Aucun,
     .resultats = false, .calculRaf = false, .numeroEntete = false, .echeances = false,
     .solde = DifferencesGeneration::Solde::Toujours};
 inline constexpr DifferencesGeneration kGenerationCf{
-    .code = "CF", .staging = "IMM_PIECE_CF", .entete = "GAPECOM",
+    .code = "CF", .staging = "IMM_PIECE_CF", .entete = "GAPECOM", .lignes = "GAPLCOM",
     .moisSociete = true, .avoirs = false, .majLigne = true,
     .montants = DifferencesGeneration::Montants::Engage,
     .resultats = true, .calculRaf = false, .numeroEntete = false, .echeances = false,
     .solde = DifferencesGeneration::Solde::SaufSoldee};
 inline constexpr DifferencesGeneration kGenerationBf{
-    .code = "BF", .staging = "IMM_PIECE_BF", .entete = "GAPEBL",
+    .code = "BF", .staging = "IMM_PIECE_BF", .entete = "GAPEBL", .lignes = "GAPLBL",
     .moisSociete = true, .avoirs = false, .majLigne = true,
     .montants = DifferencesGeneration::Montants::Aucun,
     .resultats = false, .calculRaf = false, .numeroEntete = false, .echeances = false,
     .solde = DifferencesGeneration::Solde::SaufSoldee};
 inline constexpr DifferencesGeneration kGenerationFf{
-    .code = "FF", .staging = "IMM_PIECE_FF", .entete = "GAPEFAC",
+    .code = "FF", .staging = "IMM_PIECE_FF", .entete = "GAPEFAC", .lignes = "GAPLFAC",
     .moisSociete = true, .avoirs = true, .majLigne = true,
     .montants = DifferencesGeneration::Montants::Realise,
     .resultats = false, .calculRaf = true, .numeroEntete = true, .echeances = true,
@@ -104,6 +110,21 @@ class QUARVOImport_generer : public host::Parcours {
   std::string demandeur(const std::string& code);
   void solder();
   void jauge();
+
+  // The budget booking of one piece: the lines of one service in one budget, found by
+  // "MAJ_LIGNE", booked together on one budget line through one link row when the piece ends.
+  struct LienAReporter {
+    std::string budget;
+    std::string service;
+    std::vector<std::pair<std::string, host::Valeur>> budgetRow;   // the budget's columns
+    std::vector<std::pair<std::string, host::Valeur>> projet;      // the project's
+    std::vector<std::pair<std::string, host::Valeur>> prestation;  // the service's
+    std::vector<std::string> lignes;                               // piece lines' "NUMERO"
+  };
+  void reporterSurBudgets();
+  void reporterLien(const LienAReporter& lien, double qtt, const host::Valeur& dateMaj,
+                    const host::Valeur& heureMaj);
+  bool numeroter(const char* table, host::Field& ident);
 
   const DifferencesGeneration& kind_;
   host::Field& pErreur_;
@@ -151,9 +172,10 @@ class QUARVOImport_generer : public host::Parcours {
   std::string regime_;
   int64_t saisieAna_ = 0;
   int64_t pasJauge_ = 1;
-  int64_t limite_ = -1;  // see QUARVO_FAIL_AFTER_PIECES
-  host::Valeur dateMaj_;
-  host::Valeur heureMaj_;
+  int64_t limite_ = -1;      // see QUARVO_FAIL_AFTER_PIECES
+  bool receptions_ = false;  // the company books goods received ("OPTION9" "O")
+  int64_t rang_ = 0;         // lines copied into the current piece
+  std::vector<LienAReporter> liens_;
 };
 
 class QUARVOImport_generer_df : public QUARVOImport_generer {

@@ -4,6 +4,7 @@
 #include "host/session/Session.h"
 #include "host/table/Database.h"
 #include "quarvo/frame/Appels.h"
+#include "quarvo/frame/Apports.h"
 
 namespace quarvo {
 
@@ -27,12 +28,6 @@ const QUARVOPointer_pieces::Sorte kReceptions{
     "B", "GAPEBL", "GAPLBL", "Traitement de la table GAPEBL", "No bon de réception : "};
 const QUARVOPointer_pieces::Sorte kFactures{"F", "GAPEFAC", "GAPLFAC",
                                             "Traitement de la table GAPEFAC", "No facture : "};
-
-// value × (1 − rate / 100), exactly.
-Monnaie netDe(const Monnaie& value, double rate) {
-  Monnaie hundred(100);
-  return value * (hundred - Monnaie::fromDouble(rate)) / hundred;
-}
 
 }  // namespace
 
@@ -290,33 +285,15 @@ void QUARVOPointer_pieces::creer_lappr(Evt* evt) {
   lappr_.ecrire("GCPARTIC_CODE", ligne("GCPARTIC_CODE"));
   lappr_.ecrire("DESIG", ligne("DESIG"));
 
-  // Net unit price: the line's discount, the piece's discount and prompt-payment discount,
-  // then the piece's carriage and costs spread in proportion to the line's amount. The line's
-  // share of carriage and costs is an amount for the whole line: each unit bears its share
-  // divided by the line's quantity (added as it is, the share would be counted once per unit).
-  Monnaie puht = netDe(toMonnaie(ligne("PUHT")), toDouble(ligne("TAUX_REMISE")));
-  puht = netDe(puht, toDouble(entete("TAUX_REMISE")));
-  puht = netDe(puht, toDouble(entete("TAUX_ESCOMPTE")));
-  Monnaie brut = toMonnaie(entete("BRUT"));
-  Monnaie lineQte = Monnaie::fromDouble(toDouble(ligne("QTE")));
-  if (!brut.isZero() && !lineQte.isZero()) {
-    Monnaie lineHt = toMonnaie(ligne("HT"));
-    puht += toMonnaie(entete("PORT_HT")) * lineHt / brut / lineQte;
-    puht += toMonnaie(entete("FRAIS_HT")) * lineHt / brut / lineQte;
-  }
-  double qte = 0;
-  double qtt = 0;
-  if (vEComposant_.text() == "GAPEFAC") {
-    qte = toDouble(ligne("QTE"));
-    if (entete("TYPE").toChaine() == "A") qte = -qte;
-  } else {
-    qte = toDouble(ligne("QTE")) - toDouble(ligne("QTE_SOLDEE"));
-    qtt = toDouble(ligne("QTT"));
-  }
-  lappr_.ecrire("PUHT", Valeur::monnaie(puht));
-  lappr_.ecrire("QTE", Valeur::dbl(qte));
-  lappr_.ecrire("QTT", Valeur::dbl(qtt));
-  lappr_.ecrire("HT", Valeur::monnaie(valeurArrondie(Monnaie::fromDouble(qte) * puht, 2, '=')));
+  // What the line contributes: the rule every path that links a piece shares.
+  auto colonneEntete = [this](const std::string& c) { return entete(c); };
+  auto colonneLigne = [this](const std::string& c) { return ligne(c); };
+  frame::ApportLigne apport = frame::apportLigne(
+      frame::enteteAchat(vEComposant_.text(), colonneEntete), frame::ligneAchat(colonneLigne));
+  lappr_.ecrire("PUHT", Valeur::monnaie(apport.puht));
+  lappr_.ecrire("QTE", Valeur::dbl(apport.qte));
+  lappr_.ecrire("QTT", Valeur::dbl(apport.qtt));
+  lappr_.ecrire("HT", Valeur::monnaie(apport.ht));
   lappr_.ecrire("SECAN_CODE", vSecanCode_.value());
   lappr_.ecrire("ERREUR", Valeur::entier(0));
 }

@@ -1,10 +1,9 @@
 #include "quarvo/links/QUARVOInterface.h"
 
-#include <algorithm>
-
 #include "host/session/Session.h"
 #include "host/table/Database.h"
 #include "quarvo/frame/Appels.h"
+#include "quarvo/frame/Apports.h"
 #include "quarvo/frame/Keys.h"
 
 namespace quarvo {
@@ -19,13 +18,6 @@ namespace {
 std::string anneeMois(const Date& d) {
   std::string text = d.text();
   return text.size() == 10 ? text.substr(6, 4) + text.substr(3, 2) : std::string();
-}
-
-// The part of a goods-received link still to be invoiced: HT / QTE × (QTE − QTT), rounded to
-// the cent. A row without quantity contributes nothing.
-Monnaie partNonFacturee(const Monnaie& ht, double qte, double qtt) {
-  if (qte == 0 || qte - qtt == 0) return Monnaie();
-  return valeurArrondie(ht * Monnaie::fromDouble(qte - qtt) / Monnaie::fromDouble(qte), 2, '=');
 }
 
 }  // namespace
@@ -213,8 +205,9 @@ void QUARVOInterface::mettreAJour(Evt* evt, int sign) {
     Valeur pieceKind = quarvo_.valeur("COMPOSANT");
     Valeur pieceIdent = quarvo_.valeur("COMPOSANT_IDENT");
     Monnaie ht = toMonnaie(quarvo_.valeur("HT"));
+    frame::ApportLien apport = frame::apportLien(quarvo_, receipts);
     if (kind == "GAPECOM") {
-      totCommandes += ht;
+      totCommandes += apport.engage;
       // The results module receives the change of what remains to commit on the post.
       resu_.preparer();
       resu_.ecrire("AFAFFA_IDENT", quarvo_.valeur("AFAFFA_IDENT"));
@@ -228,13 +221,11 @@ void QUARVOInterface::mettreAJour(Evt* evt, int sign) {
     }
     if (kind == "GAPEBL") {
       if (!receipts) continue;
-      Monnaie part =
-          partNonFacturee(ht, toDouble(quarvo_.valeur("QTE")), toDouble(quarvo_.valeur("QTT")));
-      totReceptions += part;
+      totReceptions += apport.realise;
       // A receipt fully invoiced has nothing left to book: no movement of its own.
-      if (part.isZero()) continue;
+      if (apport.realise.isZero()) continue;
     } else if (kind == "GAPEFAC" || kind == "AFEFFO") {
-      totFactures += ht;
+      totFactures += apport.realise;
       // An invoice deleted in its module still counts, but has no movement any more.
       if (validation && kind == "GAPEFAC" &&
           appeler(*this, "GAPEFAC", "LECTURE_NUMERO_DOC", {quarvo_.valeur("PIECE")}) != 0) {
@@ -255,39 +246,12 @@ void QUARVOInterface::mettreAJour(Evt* evt, int sign) {
 
   Champ veng("VENG", aflbud_);
   Champ vrea("VREA", aflbud_);
-  Champ vraf("VRAF", aflbud_);
   Monnaie realise = totReceptions + totFactures;
   veng.set(validation ? veng.monnaie() + totCommandes : veng.monnaie() - totCommandes);
   for (size_t i = 0; i < 3; ++i)
     vrea.setAt(i, validation ? vrea.at(i) + realise : vrea.at(i) - realise);
 
-  double hbud = toDouble(aflbud_.valeur("HBUD"));
-  double hrea = toDouble(aflbud_.valeur("HREA"));
-  Monnaie vbud = toMonnaie(aflbud_.valeur("VBUD_D"));
-  if (aflbud_.valeur("AFFECTE").toChaine() != "O") {
-    double hraf = hbud - hrea;
-    Monnaie reste = vbud - vrea.at(0);
-    if (hbud == 0 && vbud.isZero()) {
-      hraf = 0;
-      reste = Monnaie();
-    }
-    if (hraf < 0) {
-      hraf = 0;
-      reste = Monnaie();
-    }
-    if (reste < Monnaie()) reste = Monnaie();
-    aflbud_.ecrire("HRAF", Valeur::dbl(hraf));
-    for (size_t i = 0; i < 3; ++i) vraf.setAt(i, reste);
-  }
-  double hraf = toDouble(aflbud_.valeur("HRAF"));
-  double avt = 0;
-  if (hbud != 0) {
-    avt = (hbud - hraf) / hbud * 100;
-  } else if (!vbud.isZero()) {
-    avt = ((vbud - vraf.at(0)) * int64_t{100} / vbud).toDouble();
-  }
-  avt = std::clamp(avt, 0.0, 100.0);
-  aflbud_.ecrire("AVT", Valeur::dbl(avt));
+  frame::restesEtAvancement(aflbud_);
 
   if (appeler(*this, "AFLBUD", "ECRITURE", {ident.value()}) != 0) {
     erreurMethode(1, evt);

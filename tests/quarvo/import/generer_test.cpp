@@ -59,17 +59,18 @@ TEST(ImportGenererTest, InvoicesAndCreditNotesAreCreatedBookedAndLinkedOnce) {
             "0000001002|2|0|TABLEAU-ELEC|Tableau posé|AFF001|0000000191|0000000093|1.0|350.00|"
             "350.00|315.00\n"
             "0000001002|3|2||Livré le 14/12||||0.0|0.00|0.00|0.00\n");
-  // Two lines of one service: one link row; the credit note books negatively.
+  // Two lines of one service: one link row, at their net amount (360.00 + 350.00 less 10 %);
+  // the credit note books negatively.
   EXPECT_EQ(requete(t, R"(SELECT AFEBUD_IDENT, AFAFFA_CODE, AFLBUD_IDENT, COMPOSANT,
                                 COMPOSANT_IDENT, PIECE, DATE_PIECE, QTE, HT, CLE_COMPO
                            FROM "QUARVO" ORDER BY IDENT)"),
             "0000000201|AFF001|0000000211|GAPEFAC|0000001001|AV26000002|2026-12-16|-1.0|-180.00|"
             "0000000211|GAPEFAC|AV26000002\n"
-            "0000000201|AFF001|0000000211|GAPEFAC|0000001002|FA26000001|2026-12-15|3.0|710.00|"
+            "0000000201|AFF001|0000000211|GAPEFAC|0000001002|FA26000001|2026-12-15|3.0|675.00|"
             "0000000211|GAPEFAC|FA26000001\n");
   EXPECT_EQ(
       requete(t, R"(SELECT VREA, VRAF, round(AVT, 4) FROM "AFLBUD" WHERE IDENT = '0000000211')"),
-      "530.00;530.00;530.00|5470.00;5470.00;5470.00|8.8333\n");
+      "495.00;495.00;495.00|5505.00;5505.00;5505.00|8.25\n");
   EXPECT_EQ(requete(t, R"(SELECT GAPEFAC_IDENT, NUMERO_DOC, DATE_ECHEANCE, MONTANT FROM "GAPECH"
                            WHERE IDENT > '0000001000' ORDER BY GAPEFAC_IDENT)"),
             "0000001001|AV26000002|2027-01-31|216.00\n"
@@ -136,12 +137,15 @@ TEST(ImportGenererTest, OrdersReceiptsAndQuotesBookSettleAndCreateTheirRequester
             "5.0|5.0\n2.0|0.0\n");
   EXPECT_EQ(requete(t, R"(SELECT QTE_ATTENDUE FROM "GCPSTOCK" WHERE IDENT = '0000000196')"),
             "15.0\n");
+  // The settled order has nothing left to commit: linked to nothing, as the pointing would.
   EXPECT_EQ(
       requete(t, R"(SELECT IDENT, VENG FROM "AFLBUD" WHERE IDENT IN ('0000000211', '0000000212')
                            ORDER BY IDENT)"),
-      "0000000211|360.00\n0000000212|62.50\n");
+      "0000000211|360.00\n0000000212|0.00\n");
+  EXPECT_EQ(requete(t, R"(SELECT PIECE, HT FROM "QUARVO" WHERE COMPOSANT = 'GAPECOM')"),
+            "CF26100002|360.00\n");
   EXPECT_EQ(requete(t, R"(SELECT AFPOST_CODE, ANNEE_MOIS, VENG FROM "AFRESU" ORDER BY ANNEE_MOIS)"),
-            "ACH-MAT|202612|422.50\n");
+            "ACH-MAT|202612|360.00\n");
 
   std::string receptions =
       test::enteteAutre() + ligne({"BR26100001", "07/12/2026", "LOCAPRO", "AFF001", "BU26-0001",
@@ -150,8 +154,10 @@ TEST(ImportGenererTest, OrdersReceiptsAndQuotesBookSettleAndCreateTheirRequester
   EXPECT_EQ(requete(t, R"(SELECT AFLBUD_IDENT, COMPOSANT, PIECE, QTE, HT FROM "QUARVO"
                            WHERE COMPOSANT = 'GAPEBL')"),
             "0000000214|GAPEBL|BR26100001|2.0|360.00\n");
+  // The company books goods received: the part not yet invoiced is realised, with a movement.
   EXPECT_EQ(requete(t, R"(SELECT VENG, VREA FROM "AFLBUD" WHERE IDENT = '0000000214')"),
-            "0.00|0.00;0.00;0.00\n");
+            "0.00|360.00;360.00;360.00\n");
+  EXPECT_EQ(requete(t, R"(SELECT COUNT(*) FROM "AFMOUV" WHERE COMPOSANT = 'GAPEBL')"), "1\n");
 
   // A quote request is settled on every run, also when it already exists.
   std::string demandes =
