@@ -220,9 +220,9 @@ void QUARVOInterface::mettreAJour(Evt* evt, int sign) {
       continue;
     }
     if (kind == "GAPEBL") {
-      if (!receipts) continue;
       totReceptions += apport.realise;
-      // A receipt fully invoiced has nothing left to book: no movement of its own.
+      // A receipt that books nothing (fully invoiced, or the company does not book goods
+      // received) has no movement of its own.
       if (apport.realise.isZero()) continue;
     } else if (kind == "GAPEFAC" || kind == "AFEFFO") {
       totFactures += apport.realise;

@@ -158,6 +158,18 @@ TEST(ImporterTest, ControlOnlyKeepsFilesAndImportDeletesOnlyCleanOnes) {
           "MESSAGE Liste des erreurs d'import | " +
           premiere + "\n");
   EXPECT_NE(transcript.find("Code fournisseur <NOBODY> inexistant"), std::string::npos);
+
+  // A file that passes the control but whose generation fails is kept for the next run.
+  test::ecrireFichier(t, "df.Txt", devisSain());
+  t.sql(R"(CREATE TRIGGER "REFUS" BEFORE INSERT ON "GAPEDEV"
+           BEGIN SELECT RAISE(ABORT, 'refused'); END;
+           DELETE FROM "GAPEDEV" WHERE IDENT > '0000001000';)");
+  valider(ouvrir(t));
+  EXPECT_TRUE(fs::exists(t.dir() / "df.Txt"));
+  EXPECT_EQ(requete(t, R"(SELECT COUNT(*) FROM "GAPEDEV" WHERE IDENT > '0000001000')"), "0\n");
+  t.sql(R"(DROP TRIGGER "REFUS")");
+  valider(ouvrir(t));
+  EXPECT_FALSE(fs::exists(t.dir() / "df.Txt"));
 }
 
 std::string lire(const fs::path& p) {

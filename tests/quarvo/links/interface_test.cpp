@@ -78,6 +78,13 @@ TEST_F(InterfaceTest, ValidationAddsEveryKindOfLinkAndThePairLeavesFiguresUnchan
   EXPECT_EQ(figures(), "0.00 | 0.00;0.00;0.00 | 6000.00;6000.00;6000.00 | 0 | 0");
   EXPECT_EQ(t_.value("AFRESU", "VENG", "AFAFFA_IDENT", "0000000011"), "0.00");
   EXPECT_EQ(count("AFMOUV", ""), 0);
+
+  // A company that does not book goods received: the receipt's 66.67 stays out, and it gets no
+  // movement.
+  t_.sql("UPDATE \"AFSOCI\" SET \"OPTION9\" = 'N'");
+  ASSERT_EQ(call("VALIDATION_MAJ", {val(kLine)}), 0);
+  EXPECT_EQ(figures().substr(0, 35), "1500.00 | 1665.50;1665.50;1665.50 |");
+  EXPECT_EQ(count("AFMOUV", "COMPOSANT=GAPEBL"), 0);
 }
 
 TEST_F(InterfaceTest, RemainingFiguresAndProgressFollowTheBudget) {
@@ -93,6 +100,12 @@ TEST_F(InterfaceTest, RemainingFiguresAndProgressFollowTheBudget) {
   link("0000005002", "0000000212", "GAPEFAC", "0000000601", "FF26000001", 1, 0, "10.00");
   ASSERT_EQ(call("VALIDATION_MAJ", {val("0000000212")}), 0);
   EXPECT_EQ(figures("0000000212"), "0.00 | 10.00;10.00;10.00 | 0.00;0.00;0.00 | 0 | 0");
+
+  // A lone credit note: realised below zero, more remains than was budgeted; progress stays 0.
+  link("0000005004", "0000000214", "GAPEFAC", "0000000603", "AV26000001", -1, 0, "-100.00");
+  ASSERT_EQ(call("VALIDATION_MAJ", {val("0000000214")}), 0);
+  EXPECT_EQ(figures("0000000214"),
+            "0.00 | -100.00;-100.00;-100.00 | 1900.00;1900.00;1900.00 | 0 | 0");
 
   // A line whose remaining figures are kept by hand ("AFFECTE" O) keeps them.
   t_.sql(

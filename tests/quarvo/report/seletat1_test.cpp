@@ -66,6 +66,8 @@ TEST(Seletat1Test, PiecesBeforeThePeriodAreLeftOutWithoutVperioAnt) {
   ReportFixture f;
   Automate& w = f.preparer((f.t().dir() / "suivi.txt").string());
   ReportFixture::poser(w, "VPERIO_ANT", "0");
+  // A piece dated on the first day of the period belongs to the period.
+  f.t().sql(R"(UPDATE "QUARVO" SET "DATE_PIECE" = '2026-04-01' WHERE "IDENT" = 'L05')");
   f.lever(w, "VALID");
   std::string rows = f.lignes();
   EXPECT_FALSE(contient(rows, "AVANT"));
