@@ -11,6 +11,17 @@ int appeler(Automate& caller, const std::string& module, const std::string& labe
   return caller.erreurMethode();
 }
 
+bool numeroter(Automate& caller, const std::string& base, const std::string& table, Field& ident) {
+  ident.set("");
+  for (const char* label : {"ATTRIBUE_NUMERO", "VALIDE_NUMERO"}) {
+    if (appeler(caller, "ZUMNDOC", label,
+                {val(base), val("NUMEROS"), val(table), val(""), val(10), ref(ident)}) != 0) {
+      return false;
+    }
+  }
+  return true;
+}
+
 static void message(Automate& caller, Field& answer, const std::string& label,
                     const std::string& number, std::vector<std::string> extra) {
   std::vector<Arg> args{val(number), ref(answer)};

@@ -14,6 +14,12 @@ namespace quarvo::frame {
 int appeler(host::Automate& caller, const std::string& module, const std::string& label,
             std::vector<host::Arg> args = {});
 
+// A new identifier for a row of `table` in `base` ("VOVOVA", "GESCOM") from the numbering service
+// "ZUMNDOC": reserved ("ATTRIBUE_NUMERO"), then confirmed ("VALIDE_NUMERO"), ten digits, into
+// `ident`. False when either call fails.
+bool numeroter(host::Automate& caller, const std::string& base, const std::string& table,
+               host::Field& ident);
+
 // Shows message `number` of the catalogue through "COMMUN" "MESS_OK" (information) or
 // "MESS_ON" (question); `answer` receives the button ("1" yes). Extra texts fill "%1", "%2".
 void messageOk(host::Automate& caller, host::Field& answer, const std::string& number,

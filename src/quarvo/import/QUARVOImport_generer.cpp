@@ -4,6 +4,7 @@
 #include <cstdlib>
 
 #include "host/session/Session.h"
+#include "quarvo/frame/Appels.h"
 #include "quarvo/frame/Apports.h"
 #include "quarvo/frame/Keys.h"
 #include "quarvo/import/ImportOutils.h"
@@ -345,14 +346,6 @@ Valeur colonne(const std::vector<std::pair<std::string, Valeur>>& row, const cha
 
 }  // namespace
 
-bool QUARVOImport_generer::numeroter(const char* table, Field& ident) {
-  ident.set("");
-  EvtParamRef attribue{val("VOVOVA"), val("NUMEROS"), val(table), val(""), val(10), ref(ident)};
-  if (!appeler("ZUMNDOC", "ATTRIBUE_NUMERO", attribue)) return false;
-  EvtParamRef valide{val("VOVOVA"), val("NUMEROS"), val(table), val(""), val(10), ref(ident)};
-  return appeler("ZUMNDOC", "VALIDE_NUMERO", valide);
-}
-
 void QUARVOImport_generer::reporterSurBudgets() {
   if (liens_.empty()) return;
   if (pieces_.chercher(3, "IDENT", '=', vPieceIdent_.value()) != 0) return;
@@ -397,7 +390,7 @@ void QUARVOImport_generer::reporterLien(const LienAReporter& lien, double qtt,
   }
   if (vCreerAflbud_.entier() == 1) {
     Field& ident = chaine("V_AFLBUD_IDENT");
-    if (!numeroter("AFLBUD", ident)) return;
+    if (!frame::numeroter(*this, "VOVOVA", "AFLBUD", ident)) return;
     aflbud_.preparer();
     aflbud_.ecrire("IDENT", ident.value());
     aflbud_.ecrire("NUMERO", Valeur::chaine(lien.budget + "|"));
@@ -421,7 +414,7 @@ void QUARVOImport_generer::reporterLien(const LienAReporter& lien, double qtt,
     avant = frame::apportLien(quarvo_, receptions_);
   } else {
     Field& ident = chaine("V_QUARVO_IDENT");
-    if (!numeroter("QUARVO", ident)) return;
+    if (!frame::numeroter(*this, "VOVOVA", "QUARVO", ident)) return;
     quarvo_.preparer();
     quarvo_.ecrire("IDENT", ident.value());
     quarvo_.ecrire("AFEBUD_IDENT", Valeur::chaine(lien.budget));
@@ -517,11 +510,7 @@ std::string QUARVOImport_generer::demandeur(const std::string& code) {
     serviceTexte = Table(this, "VOVOVA", "I_AFSERV", "").valeur("DESIG").toChaine();
   }
   Field& ident = chaine("V_GAPAPPOR_IDENT");
-  EvtParamRef attribue{val("GESCOM"), val("NUMEROS"), val("GAPAPPOR"),
-                       val(""),       val(10),        ref(ident)};
-  if (!appeler("ZUMNDOC", "ATTRIBUE_NUMERO", attribue)) return "";
-  EvtParamRef valide{val("GESCOM"), val("NUMEROS"), val("GAPAPPOR"), val(""), val(10), ref(ident)};
-  if (!appeler("ZUMNDOC", "VALIDE_NUMERO", valide)) return "";
+  if (!frame::numeroter(*this, "GESCOM", "GAPAPPOR", ident)) return "";
   session().memoire("I_GAPAPPOR").clear();
   iGapappor.ecrire("IDENT", ident.value());
   iGapappor.ecrire("CODE", Valeur::chaine(code));

@@ -124,7 +124,6 @@ class QUARVOImport_generer : public host::Parcours {
   void reporterSurBudgets();
   void reporterLien(const LienAReporter& lien, double qtt, const host::Valeur& dateMaj,
                     const host::Valeur& heureMaj);
-  bool numeroter(const char* table, host::Field& ident);
 
   const DifferencesGeneration& kind_;
   host::Field& pErreur_;

@@ -77,11 +77,7 @@ void QUARVOImputer_pieces::maj_quarvo(Evt* evt) {
                       eappr_.valeur("COMPOSANT").toChaine(), eappr_.valeur("PIECE").toChaine());
   if (quarvo_.chercher(3, "CLE_COMPO", '=', Valeur::chaine(key)) != 0) {
     quarvo_.preparer();
-    vIdent_.set("");
-    std::vector<Arg> numbering{val("VOVOVA"), val("NUMEROS"), val("QUARVO"),
-                               val(""),       val(10),        ref(vIdent_)};
-    appeler(*this, "ZUMNDOC", "ATTRIBUE_NUMERO", numbering);
-    appeler(*this, "ZUMNDOC", "VALIDE_NUMERO", numbering);
+    frame::numeroter(*this, "VOVOVA", "QUARVO", vIdent_);
     quarvo_.ecrire("IDENT", vIdent_.value());
     quarvo_.ecrire("AFEBUD_IDENT", vappr_.valeur("AFEBUD_IDENT"));
     quarvo_.ecrire("AFAFFA_IDENT", vappr_.valeur("AFAFFA_IDENT"));

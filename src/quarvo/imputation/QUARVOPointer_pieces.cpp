@@ -380,11 +380,7 @@ void QUARVOPointer_pieces::creer_aflbud(Evt* evt) {
     return;
   }
   Field& ident = vAflbudIdent_;
-  ident.set("");
-  std::vector<Arg> numbering{val("VOVOVA"), val("NUMEROS"), val("AFLBUD"),
-                             val(""),       val(10),        ref(ident)};
-  if (appeler(*this, "ZUMNDOC", "ATTRIBUE_NUMERO", numbering) != 0 ||
-      appeler(*this, "ZUMNDOC", "VALIDE_NUMERO", numbering) != 0) {
+  if (!frame::numeroter(*this, "VOVOVA", "AFLBUD", ident)) {
     erreurMethode(1, evt);
     return;
   }
