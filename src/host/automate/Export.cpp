@@ -2,6 +2,7 @@
 
 #include <algorithm>
 
+#include "host/automate/Parcours.h"
 #include "host/report/Classeur.h"
 #include "host/session/Session.h"
 
@@ -132,7 +133,6 @@ void Export::executer(Evt* evt) {
     }
     Table& t = courant();
     t.effacerCriteres();
-    t.ouvrir();
     const auto& schema = t.store().schema();
     std::vector<std::string> columns;
     for (const auto& c : sort_) {
@@ -142,22 +142,7 @@ void Export::executer(Evt* evt) {
         columns.push_back(c);
       }
     }
-    std::vector<std::pair<std::vector<Valeur>, RowId>> order;
-    order.reserve(t.tailleSelection());
-    while (t.lire(1) == 0) {
-      std::vector<Valeur> key;
-      key.reserve(columns.size());
-      for (const auto& col : columns) key.push_back(t.valeur(col));
-      order.emplace_back(std::move(key), t.courantId());
-    }
-    std::stable_sort(order.begin(), order.end(), [](const auto& a, const auto& b) {
-      for (size_t i = 0; i < a.first.size(); ++i) {
-        int c = comparerTri(a.first[i], b.first[i]);
-        if (c != 0) return c < 0;
-      }
-      return false;
-    });
-    for (const auto& [key, id] : order) {
+    for (RowId id : selectionTriee(t, columns, comparerTri)) {
       if (termine()) break;
       if (t.aller(id) != 0) continue;
       raise("POUR_TOUT", e);

@@ -5,6 +5,35 @@
 
 namespace quarvo::host {
 
+std::vector<RowId> selectionTriee(Table& t, const std::vector<std::string>& colonnes,
+                                  Comparaison comparer) {
+  std::vector<RowId> order;
+  if (comparer == &Valeur::compare && t.ouvrirTrie(colonnes)) {
+    order.reserve(t.tailleSelection());
+    for (size_t i = 0; i < t.tailleSelection(); ++i) order.push_back(t.selectionnee(i));
+    return order;
+  }
+  t.ouvrir();
+  std::vector<std::pair<std::vector<Valeur>, RowId>> keyed;
+  keyed.reserve(t.tailleSelection());
+  while (t.lire(1) == 0) {
+    std::vector<Valeur> key;
+    key.reserve(colonnes.size());
+    for (const auto& col : colonnes) key.push_back(t.valeur(col));
+    keyed.emplace_back(std::move(key), t.courantId());
+  }
+  std::stable_sort(keyed.begin(), keyed.end(), [comparer](const auto& a, const auto& b) {
+    for (size_t i = 0; i < a.first.size(); ++i) {
+      int c = comparer(a.first[i], b.first[i]);
+      if (c != 0) return c < 0;
+    }
+    return false;
+  });
+  order.reserve(keyed.size());
+  for (const auto& k : keyed) order.push_back(k.second);
+  return order;
+}
+
 Parcours::Parcours(Evt* creating) : Automate(creating) {}
 Parcours::~Parcours() = default;
 
@@ -33,29 +62,7 @@ void Parcours::executer(Evt* evt) {
     Table& t = courant();
     t.effacerCriteres();
     for (const auto& c : criteria_) t.ajouterCritere(c.column, c.op, c.value);
-    // The selection in the sort plan's order, ties in key order: the store orders it when it
-    // can, else it comes in key order and is sorted here (stable).
-    std::vector<RowId> order;
-    if (t.ouvrirTrie(sort_)) {
-      order.reserve(t.tailleSelection());
-      for (size_t i = 0; i < t.tailleSelection(); ++i) order.push_back(t.selectionnee(i));
-    } else {
-      t.ouvrir();
-      std::vector<std::pair<std::vector<Valeur>, RowId>> keyed;
-      while (t.lire(1) == 0) {
-        std::vector<Valeur> key;
-        for (const auto& col : sort_) key.push_back(t.valeur(col));
-        keyed.emplace_back(std::move(key), t.courantId());
-      }
-      std::stable_sort(keyed.begin(), keyed.end(), [](const auto& a, const auto& b) {
-        for (size_t i = 0; i < a.first.size(); ++i) {
-          int c = Valeur::compare(a.first[i], b.first[i]);
-          if (c != 0) return c < 0;
-        }
-        return false;
-      });
-      for (const auto& k : keyed) order.push_back(k.second);
-    }
+    std::vector<RowId> order = selectionTriee(t, sort_);
     std::optional<Valeur> group;
     for (RowId id : order) {
       if (termine() || stop_) break;

@@ -14,6 +14,14 @@
 
 namespace quarvo::host {
 
+// How two values of a sort column compare: below 0, 0 or above 0.
+using Comparaison = int (*)(const Valeur&, const Valeur&);
+
+// The rows `t`'s criteria select, in the order of `colonnes` compared by `comparer`, ties in key
+// order. With the values' own comparison the store orders them itself when it can.
+std::vector<RowId> selectionTriee(Table& t, const std::vector<std::string>& colonnes,
+                                  Comparaison comparer = Valeur::compare);
+
 class Parcours : public Automate {
  public:
   explicit Parcours(Evt* creating);

@@ -8,6 +8,7 @@
 #include "host/Execute.h"
 #include "host/automate/Automate.h"
 #include "host/automate/Export.h"
+#include "host/automate/Parcours.h"
 #include "host/table/Table.h"
 
 namespace quarvo::host::report {
@@ -167,20 +168,7 @@ class Impression {
     }
 
     t->effacerCriteres();
-    t->ouvrir();
-    std::vector<std::pair<std::vector<Valeur>, RowId>> order;
-    while (t->lire(1) == 0) {
-      std::vector<Valeur> key;
-      for (const auto& col : p.tri) key.push_back(t->valeur(col));
-      order.emplace_back(std::move(key), t->courantId());
-    }
-    std::stable_sort(order.begin(), order.end(), [](const auto& x, const auto& y) {
-      for (size_t i = 0; i < x.first.size(); ++i) {
-        int c = comparerTri(x.first[i], y.first[i]);
-        if (c != 0) return c < 0;
-      }
-      return false;
-    });
+    std::vector<RowId> order = selectionTriee(*t, p.tri, comparerTri);
 
     size_t levels = p.niveaux.size();
     std::vector<Sommes> groupes(levels);
@@ -193,7 +181,7 @@ class Impression {
         for (const auto& b : p.niveaux[n].fin) bande(b, &groupes[n]);
       }
     };
-    for (const auto& [key, id] : order) {
+    for (RowId id : order) {
       if (t->aller(id) != 0) continue;
       size_t change = levels;
       for (size_t n = 0; n < levels; ++n) {
