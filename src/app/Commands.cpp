@@ -5,7 +5,9 @@
 #include <CLI/CLI.hpp>
 #include <deque>
 #include <fstream>
+#include <functional>
 #include <iostream>
+#include <memory>
 #include <optional>
 
 #include "app/AnalyseCommand.h"
@@ -65,6 +67,256 @@ int printOutcome(std::ostream& out, int outcome) {
   return outcome == 0 ? 0 : 1;
 }
 
+// What a subcommand has when it runs: the streams, the driver, and (unless it runs without a
+// database) the workspace and its session, current.
+struct Contexte {
+  const Options& options;
+  std::ostream& out;
+  std::ostream& err;
+  Workspace* workspace = nullptr;
+  Session* session = nullptr;
+};
+
+// A subcommand: its options declared on the command line, and what it does once they are parsed.
+struct Commande {
+  enum class Base { Aucune, Ouverte, Creee };
+  CLI::App* app = nullptr;
+  Base base = Base::Ouverte;
+  std::function<int(Contexte&)> executer;
+};
+
+Commande initCommand(CLI::App& cli) {
+  auto demo = std::make_shared<bool>(false);
+  auto* app = cli.add_subcommand("init", "Create the schema (idempotent)");
+  app->add_flag("--demo", *demo, "Seed the demo data set");
+  return {app, Commande::Base::Creee, [demo](Contexte& c) {
+            bool seeded = *demo && c.workspace->seedDemo();
+            c.out << "database " << c.options.db << " ready"
+                  << (seeded ? " with the demo data" : "") << "\n";
+            return 0;
+          }};
+}
+
+Commande loadCommand(CLI::App& cli) {
+  auto table = std::make_shared<std::string>();
+  auto file = std::make_shared<std::string>();
+  auto* app = cli.add_subcommand("load", "Load rows of a table from a tab-separated file");
+  app->add_option("TABLE", *table, "Table name")->required();
+  app->add_option("FILE", *file, "Tab-separated file with a header of column names")->required();
+  return {app, Commande::Base::Ouverte, [table, file](Contexte& c) {
+            std::ifstream in(*file, std::ios::binary);
+            if (!in) throw UsageError("cannot read " + *file);
+            size_t n = loadTsv(*c.session, *table, in, *file);
+            c.out << n << " rows loaded into " << *table << "\n";
+            return 0;
+          }};
+}
+
+Commande dumpCommand(CLI::App& cli) {
+  auto table = std::make_shared<std::string>();
+  auto where = std::make_shared<std::vector<std::string>>();
+  auto* app = cli.add_subcommand("dump", "Print the rows of a table, tab-separated");
+  app->add_option("TABLE", *table, "Table name")->required();
+  app->add_option("--where", *where, "COL=VALUE filter (repeatable)");
+  return {app, Commande::Base::Ouverte, [table, where](Contexte& c) {
+            std::vector<std::pair<std::string, std::string>> filters;
+            for (const auto& w : *where) {
+              auto eq = w.find('=');
+              if (eq == std::string::npos) {
+                throw UsageError("--where expects COL=VALUE, not '" + w + "'");
+              }
+              filters.emplace_back(w.substr(0, eq), w.substr(eq + 1));
+            }
+            dumpTsv(*c.session, *table, filters, c.out);
+            return 0;
+          }};
+}
+
+Commande automataCommand(CLI::App& cli) {
+  auto* app = cli.add_subcommand("automata", "List the registered automata");
+  return {app, Commande::Base::Aucune, [](Contexte& c) {
+            for (const auto& n : Registry::instance().names()) c.out << n << "\n";
+            return 0;
+          }};
+}
+
+// "run NAME ARGS" and "call MODULE LABEL ARGS": the caller's fields are printed afterwards.
+Commande runCommand(CLI::App& cli) {
+  auto name = std::make_shared<std::string>();
+  auto params = std::make_shared<std::vector<std::string>>();
+  auto* app = cli.add_subcommand("run", "Run a registered automaton with positional parameters");
+  app->add_option("NAME", *name, "Automaton name")->required();
+  app->add_option("ARGS", *params, "Positional parameters");
+  app->allow_extras(false);
+  app->prefix_command(false);
+  return {app, Commande::Base::Ouverte, [name, params](Contexte& c) {
+            CallerFields caller(*params);
+            EvtParamRef evt(caller.args);
+            AutomatePtr automate = c.session->creer(*name, &evt);
+            if (!automate) {
+              throw UsageError("unknown automaton " + *name + " (see 'quarvo automata')");
+            }
+            checkConversions(evt, *params);
+            automate->executer(&evt);
+            c.session->executerEnAttente();
+            caller.print(c.out);
+            return printOutcome(c.out, automate->outcome());
+          }};
+}
+
+Commande callCommand(CLI::App& cli) {
+  auto module = std::make_shared<std::string>();
+  auto label = std::make_shared<std::string>();
+  auto params = std::make_shared<std::vector<std::string>>();
+  auto* app = cli.add_subcommand("call", "Run a label of a module's interface automaton");
+  app->add_option("MODULE", *module, "Module name")->required();
+  app->add_option("LABEL", *label, "Procedure label")->required();
+  app->add_option("ARGS", *params, "Positional parameters");
+  app->allow_extras(false);
+  return {app, Commande::Base::Ouverte, [module, label, params](Contexte& c) {
+            if (!Registry::instance().find(*module + "-INTERFACE")) {
+              throw UsageError("unknown module " + *module);
+            }
+            CallerFields caller(*params);
+            EvtParamRef evt(caller.args);
+            int outcome = c.session->appelerProcedure(*module, *label, &evt);
+            c.session->executerEnAttente();
+            caller.print(c.out);
+            return printOutcome(c.out, outcome);
+          }};
+}
+
+// "analyse KIND IDENT" and "cancel KIND IDENT".
+Commande pieceCommand(CLI::App& cli, const char* name, const char* description,
+                      int (*action)(Session&, const std::string&, const std::string&,
+                                    std::ostream&)) {
+  auto kind = std::make_shared<std::string>();
+  auto ident = std::make_shared<std::string>();
+  auto* app = cli.add_subcommand(name, description);
+  app->add_option("KIND", *kind, "Piece kind: GAPECOM, GAPEBL, GAPEFAC or CF, BF, FF")->required();
+  app->add_option("IDENT", *ident, "Identifier or document number of the piece")->required();
+  return {app, Commande::Base::Ouverte,
+          [kind, ident, action](Contexte& c) { return action(*c.session, *kind, *ident, c.out); }};
+}
+
+Commande recomputeCommand(CLI::App& cli) {
+  auto line = std::make_shared<std::string>();
+  auto* app = cli.add_subcommand("recompute", "Recompute a budget line's figures from its links");
+  app->add_option("LINE", *line, "Budget line identifier")->required();
+  return {app, Commande::Base::Ouverte,
+          [line](Contexte& c) { return runRecompute(*c.session, *line, c.out); }};
+}
+
+Commande checkCommand(CLI::App& cli) {
+  auto line = std::make_shared<std::optional<std::string>>();
+  auto fix = std::make_shared<bool>(false);
+  auto* app = cli.add_subcommand(
+      "check",
+      "Compare each budget line's committed and realised figures with its links (exit 1 when "
+      "some differ)");
+  app->add_option("--line", *line, "Only this budget line");
+  app->add_flag("--fix", *fix, "Bring the differing lines in line, in one transaction");
+  return {app, Commande::Base::Ouverte,
+          [line, fix](Contexte& c) { return runCheck(*c.session, *line, *fix, c.out); }};
+}
+
+Commande imputeCommand(CLI::App& cli) {
+  auto o = std::make_shared<ImputeOptions>();
+  auto* app = cli.add_subcommand(
+      "impute",
+      "Impute purchasing pieces to budget lines: without options the automatic imputation, with "
+      "options a pointing of that selection then the imputation");
+  app->add_option("--from", o->from, "Lowest creation date (dd/mm/yyyy)");
+  app->add_option("--to", o->to, "Highest creation date (dd/mm/yyyy)");
+  app->add_option("--kind", o->kind, "T all, C orders, B receipts, F invoices");
+  app->add_option("--numbers", o->numbers, "Document numbers MIN:MAX");
+  app->add_option("--project", o->project, "Project code");
+  app->add_flag("--arbitration", o->arbitration,
+                "First suitable budget line wins; a missing one is created");
+  app->add_flag("--dry-run", o->dryRun, "Point only and print the proposal");
+  return {app, Commande::Base::Ouverte,
+          [o](Contexte& c) { return runImpute(*c.session, *o, c.out); }};
+}
+
+Commande importCommand(CLI::App& cli) {
+  auto o = std::make_shared<ImportOptions>();
+  auto* app = addImportCommand(cli, *o);
+  return {app, Commande::Base::Ouverte,
+          [o](Contexte& c) { return runImport(*c.session, *o, c.out); }};
+}
+
+Commande reportCommand(CLI::App& cli) {
+  struct Saisie {
+    ReportOptions options;
+    std::string pdf;
+    std::string exportFile;
+    bool noBefore = false;
+    CLI::Option* print = nullptr;
+    CLI::Option* exporter = nullptr;
+  };
+  auto s = std::make_shared<Saisie>();
+  auto* app = cli.add_subcommand("report", "Print or export the purchase follow-up report");
+  app->add_option("--from", s->options.from,
+                  "First day (dd/mm/yyyy); default: the company's current month");
+  app->add_option("--to", s->options.to, "Last day; default: end of that month");
+  auto* project = app->add_option("--project", s->options.project, "One project by code");
+  app->add_option("--budget", s->options.budget, "One budget by identifier")->excludes(project);
+  app->add_option("--criterion", s->options.criterion,
+                  "Grouping: AFCLIE AFETAB AFSERV AFRPS1 AFRPS2 AFCRI1..5");
+  app->add_option("--options", s->options.options,
+                  "Five 0/1: page per project, lines, pieces, recap 1, recap 2 (11100)");
+  app->add_option("--states", s->options.states,
+                  "Budget states T|A|NC|NA|C, ':O' for closed budgets");
+  app->add_flag("--no-before", s->noBefore, "Leave out pieces dated before the period");
+  s->print = app->add_option("--print", s->pdf, "PDF file (default: under the database folder)")
+                 ->expected(0, 1);
+  s->exporter = app->add_option("--export", s->exportFile,
+                                "Export file; .xlsx gives a workbook (default: the saved one)")
+                    ->expected(0, 1);
+  return {app, Commande::Base::Ouverte, [s](Contexte& c) {
+            ReportOptions options = s->options;
+            options.beforePeriod = !s->noBefore;
+            if (*s->print) options.print = s->pdf;
+            if (*s->exporter) options.exportFile = s->exportFile;
+            return runReport(*c.session, options, c.out);
+          }};
+}
+
+Commande genCommand(CLI::App& cli) {
+  auto o = std::make_shared<GenerateOptions>();
+  auto* app = cli.add_subcommand(
+      "gen", "Add a synthetic data set (on a demo database) for benchmarks and large tests");
+  app->add_option("--projects", o->projects, "Projects, one budget each")->capture_default_str();
+  app->add_option("--pieces", o->pieces, "Supplier orders")->capture_default_str();
+  app->add_option("--lines", o->lines, "Lines per order")->capture_default_str();
+  app->add_option("--services", o->services, "Services, one budget line each per budget")
+      ->capture_default_str();
+  return {app, Commande::Base::Ouverte,
+          [o](Contexte& c) { return runGenerate(*c.session, *o, c.out); }};
+}
+
+Commande demoCommand(CLI::App& cli) {
+  auto dir = std::make_shared<std::string>("quarvo-demo");
+  auto* app = cli.add_subcommand("demo", "Build a demo database and show what QUARVO does");
+  app->add_option("--dir", *dir, "Folder to create afresh")->capture_default_str();
+  return {app, Commande::Base::Aucune, [dir](Contexte& c) { return runDemo(*dir, c.out, c.err); }};
+}
+
+// Runs the parsed subcommand: opens (or creates) the database and the session it needs.
+int executer(const Commande& commande, const Options& o, std::ostream& out, std::ostream& err) {
+  std::deque<std::string> answers(o.answers.begin(), o.answers.end());
+  TerminalDriver ui(err, answers, isatty(STDERR_FILENO) != 0);
+  Contexte contexte{o, out, err};
+  if (commande.base == Commande::Base::Aucune) return commande.executer(contexte);
+  std::unique_ptr<Workspace> ws =
+      commande.base == Commande::Base::Creee ? Workspace::init(o.db) : Workspace::open(o.db);
+  Session& session = ws->startSession(ui, o.company, o.user);
+  Session::Scope scope(session);
+  contexte.workspace = ws.get();
+  contexte.session = &session;
+  return commande.executer(contexte);
+}
+
 }  // namespace
 
 int runCommandLine(int argc, char** argv, std::ostream& out, std::ostream& err) {
@@ -75,217 +327,46 @@ int runCommandLine(int argc, char** argv, std::ostream& out, std::ostream& err) 
   cli.add_option("--company", o.company, "Company code of the session")->capture_default_str();
   cli.add_option("--user", o.user, "User of the session")->capture_default_str();
   cli.add_option("--answer", o.answers,
-                 "Answer to the next dialog (button number or text); repeat in order. Dialogs "
-                 "without an answer are refused");
+                 "Answer to the next dialog: a button's number or its text; repeat in order. A "
+                 "dialog without an answer, or whose answer names no button, is refused");
 
-  bool demoData = false;
-  auto* init = cli.add_subcommand("init", "Create the schema (idempotent)");
-  init->add_flag("--demo", demoData, "Seed the demo data set");
-
-  std::string table;
-  std::string file;
-  auto* load = cli.add_subcommand("load", "Load rows of a table from a tab-separated file");
-  load->add_option("TABLE", table, "Table name")->required();
-  load->add_option("FILE", file, "Tab-separated file with a header of column names")->required();
-
-  std::vector<std::string> where;
-  auto* dump = cli.add_subcommand("dump", "Print the rows of a table, tab-separated");
-  dump->add_option("TABLE", table, "Table name")->required();
-  dump->add_option("--where", where, "COL=VALUE filter (repeatable)");
-
-  auto* automata = cli.add_subcommand("automata", "List the registered automata");
-
-  std::string name;
-  std::string label;
-  std::vector<std::string> params;
-  auto* run = cli.add_subcommand("run", "Run a registered automaton with positional parameters");
-  run->add_option("NAME", name, "Automaton name")->required();
-  run->add_option("ARGS", params, "Positional parameters");
-
-  auto* call = cli.add_subcommand("call", "Run a label of a module's interface automaton");
-  call->add_option("MODULE", name, "Module name")->required();
-  call->add_option("LABEL", label, "Procedure label")->required();
-  call->add_option("ARGS", params, "Positional parameters");
-
-  std::string pieceKind;
-  std::string pieceIdent;
-  auto* analyse = cli.add_subcommand(
-      "analyse", "Check that a purchasing piece can be carried into the accounting link");
-  auto* cancel = cli.add_subcommand("cancel", "Remove every link of one purchasing piece");
-  for (auto* sub : {analyse, cancel}) {
-    sub->add_option("KIND", pieceKind, "Piece kind: GAPECOM, GAPEBL, GAPEFAC or CF, BF, FF")
-        ->required();
-    sub->add_option("IDENT", pieceIdent, "Identifier or document number of the piece")->required();
-  }
-
-  std::string lineIdent;
-  auto* recompute =
-      cli.add_subcommand("recompute", "Recompute a budget line's figures from its links");
-  recompute->add_option("LINE", lineIdent, "Budget line identifier")->required();
-
-  std::optional<std::string> checkLine;
-  bool fix = false;
-  auto* check = cli.add_subcommand(
-      "check",
-      "Compare each budget line's committed and realised figures with its links (exit 1 when "
-      "some differ)");
-  check->add_option("--line", checkLine, "Only this budget line");
-  check->add_flag("--fix", fix, "Bring the differing lines in line, in one transaction");
-
-  ImputeOptions imputeOptions;
-  auto* impute = cli.add_subcommand(
-      "impute",
-      "Impute purchasing pieces to budget lines: without options the automatic imputation, with "
-      "options a pointing of that selection then the imputation");
-  impute->add_option("--from", imputeOptions.from, "Lowest creation date (dd/mm/yyyy)");
-  impute->add_option("--to", imputeOptions.to, "Highest creation date (dd/mm/yyyy)");
-  impute->add_option("--kind", imputeOptions.kind, "T all, C orders, B receipts, F invoices");
-  impute->add_option("--numbers", imputeOptions.numbers, "Document numbers MIN:MAX");
-  impute->add_option("--project", imputeOptions.project, "Project code");
-  impute->add_flag("--arbitration", imputeOptions.arbitration,
-                   "First suitable budget line wins; a missing one is created");
-  impute->add_flag("--dry-run", imputeOptions.dryRun, "Point only and print the proposal");
-
-  ImportOptions importOptions;
-  auto* import = addImportCommand(cli, importOptions);
-
-  ReportOptions reportOptions;
-  std::string pdfFile;
-  std::string exportFile;
-  bool noBefore = false;
-  auto* report = cli.add_subcommand("report", "Print or export the purchase follow-up report");
-  report->add_option("--from", reportOptions.from,
-                     "First day (dd/mm/yyyy); default: the company's current month");
-  report->add_option("--to", reportOptions.to, "Last day; default: end of that month");
-  auto* projectOption =
-      report->add_option("--project", reportOptions.project, "One project by code");
-  report->add_option("--budget", reportOptions.budget, "One budget by identifier")
-      ->excludes(projectOption);
-  report->add_option("--criterion", reportOptions.criterion,
-                     "Grouping: AFCLIE AFETAB AFSERV AFRPS1 AFRPS2 AFCRI1..5");
-  report->add_option("--options", reportOptions.options,
-                     "Five 0/1: page per project, lines, pieces, recap 1, recap 2 (11100)");
-  report->add_option("--states", reportOptions.states,
-                     "Budget states T|A|NC|NA|C, ':O' for closed budgets");
-  report->add_flag("--no-before", noBefore, "Leave out pieces dated before the period");
-  auto* printOption =
-      report->add_option("--print", pdfFile, "PDF file (default: under the database folder)")
-          ->expected(0, 1);
-  auto* exportOption =
-      report
-          ->add_option("--export", exportFile,
-                       "Export file; .xlsx gives a workbook (default: the saved one)")
-          ->expected(0, 1);
-
-  GenerateOptions genOptions;
-  auto* gen = cli.add_subcommand(
-      "gen", "Add a synthetic data set (on a demo database) for benchmarks and large tests");
-  gen->add_option("--projects", genOptions.projects, "Projects, one budget each")
-      ->capture_default_str();
-  gen->add_option("--pieces", genOptions.pieces, "Supplier orders")->capture_default_str();
-  gen->add_option("--lines", genOptions.lines, "Lines per order")->capture_default_str();
-  gen->add_option("--services", genOptions.services, "Services, one budget line each per budget")
-      ->capture_default_str();
-
-  std::string demoDir = "quarvo-demo";
-  auto* demo = cli.add_subcommand("demo", "Build a demo database and show what QUARVO does");
-  demo->add_option("--dir", demoDir, "Folder to create afresh")->capture_default_str();
-
-  for (auto* sub : {run, call}) sub->allow_extras(false);
-  run->prefix_command(false);
+  const std::vector<Commande> commandes{
+      initCommand(cli),
+      loadCommand(cli),
+      dumpCommand(cli),
+      automataCommand(cli),
+      runCommand(cli),
+      callCommand(cli),
+      pieceCommand(cli, "analyse",
+                   "Check that a purchasing piece can be carried into the accounting link",
+                   runAnalyse),
+      pieceCommand(cli, "cancel", "Remove every link of one purchasing piece", runCancel),
+      recomputeCommand(cli),
+      checkCommand(cli),
+      imputeCommand(cli),
+      importCommand(cli),
+      reportCommand(cli),
+      genCommand(cli),
+      demoCommand(cli),
+  };
 
   try {
     cli.parse(argc, argv);
   } catch (const CLI::ParseError& e) {
     if (e.get_exit_code() == 0) {
       out << cli.help();
-      if (auto* s = cli.get_subcommands().empty() ? nullptr : cli.get_subcommands().front()) {
-        (void)s;
-      }
       return 0;
     }
     return cli.exit(e, out, err) == 0 ? 0 : 2;
   }
 
   try {
-    std::deque<std::string> answers(o.answers.begin(), o.answers.end());
-    TerminalDriver ui(err, answers, isatty(STDERR_FILENO) != 0);
-
-    if (*demo) return runDemo(demoDir, out, err);
-
-    if (*automata) {
-      for (const auto& n : Registry::instance().names()) out << n << "\n";
-      return 0;
+    for (const auto& commande : commandes) {
+      if (*commande.app) return executer(commande, o, out, err);
     }
-
-    std::unique_ptr<Workspace> ws = *init ? Workspace::init(o.db) : Workspace::open(o.db);
-    Session& session = ws->startSession(ui, o.company, o.user);
-    Session::Scope scope(session);
-
-    if (*init) {
-      bool seeded = demoData && ws->seedDemo();
-      out << "database " << o.db << " ready" << (seeded ? " with the demo data" : "") << "\n";
-      return 0;
-    }
-    if (*load) {
-      std::ifstream in(file, std::ios::binary);
-      if (!in) throw UsageError("cannot read " + file);
-      size_t n = loadTsv(session, table, in, file);
-      out << n << " rows loaded into " << table << "\n";
-      return 0;
-    }
-    if (*dump) {
-      std::vector<std::pair<std::string, std::string>> filters;
-      for (const auto& w : where) {
-        auto eq = w.find('=');
-        if (eq == std::string::npos) throw UsageError("--where expects COL=VALUE, not '" + w + "'");
-        filters.emplace_back(w.substr(0, eq), w.substr(eq + 1));
-      }
-      dumpTsv(session, table, filters, out);
-      return 0;
-    }
-    if (*report) {
-      reportOptions.beforePeriod = !noBefore;
-      if (*printOption) reportOptions.print = pdfFile;
-      if (*exportOption) reportOptions.exportFile = exportFile;
-      return runReport(session, reportOptions, out);
-    }
-    if (*import) return runImport(session, importOptions, out);
-    if (*gen) return runGenerate(session, genOptions, out);
-    if (*impute) return runImpute(session, imputeOptions, out);
-    if (*analyse) return runAnalyse(session, pieceKind, pieceIdent, out);
-    if (*cancel) return runCancel(session, pieceKind, pieceIdent, out);
-    if (*recompute) return runRecompute(session, lineIdent, out);
-    if (*check) return runCheck(session, checkLine, fix, out);
-    if (*run) {
-      CallerFields caller(params);
-      EvtParamRef evt(caller.args);
-      AutomatePtr automate = session.creer(name, &evt);
-      if (!automate) throw UsageError("unknown automaton " + name + " (see 'quarvo automata')");
-      checkConversions(evt, params);
-      automate->executer(&evt);
-      session.executerEnAttente();
-      caller.print(out);
-      return printOutcome(out, automate->outcome());
-    }
-    if (*call) {
-      if (!Registry::instance().find(name + "-INTERFACE")) {
-        throw UsageError("unknown module " + name);
-      }
-      CallerFields caller(params);
-      EvtParamRef evt(caller.args);
-      int outcome = session.appelerProcedure(name, label, &evt);
-      session.executerEnAttente();
-      caller.print(out);
-      return printOutcome(out, outcome);
-    }
-  } catch (const UsageError& e) {
-    err << "quarvo: " << e.what() << "\n";
-    return 2;
-  } catch (const UException& e) {
-    err << "quarvo: " << e.what() << "\n";
-    return 2;
   } catch (const std::exception& e) {
+    // Usage errors, the runtime's own faults and the environment's all end the same way: one
+    // line that says what and where.
     err << "quarvo: " << e.what() << "\n";
     return 2;
   }
