@@ -5,6 +5,7 @@
 #include <ostream>
 
 #include "app/Workspace.h"
+#include "host/Texte.h"
 #include "host/table/Table.h"
 
 namespace quarvo::app {
@@ -12,11 +13,6 @@ namespace quarvo::app {
 using namespace host;
 
 namespace {
-
-size_t displayWidth(const std::string& s) {
-  return static_cast<size_t>(
-      std::count_if(s.begin(), s.end(), [](char c) { return (c & 0xC0) != 0x80; }));
-}
 
 struct Kind {
   const char* table;
@@ -27,23 +23,9 @@ constexpr Kind kKinds[] = {{"GAPECOM", "CF"}, {"GAPEBL", "BF"}, {"GAPEFAC", "FF"
 }  // namespace
 
 void printTable(std::ostream& out, const TextRow& heading, const std::vector<TextRow>& rows) {
-  std::vector<size_t> width(heading.size(), 0);
-  auto measure = [&](const TextRow& row) {
-    for (size_t c = 0; c < width.size() && c < row.size(); ++c) {
-      width[c] = std::max(width[c], displayWidth(row[c]));
-    }
-  };
-  measure(heading);
-  for (const auto& row : rows) measure(row);
-  auto line = [&](const TextRow& row) {
-    for (size_t c = 0; c < row.size(); ++c) {
-      out << row[c];
-      if (c + 1 < row.size()) out << std::string(width[c] - displayWidth(row[c]) + 2, ' ');
-    }
-    out << "\n";
-  };
-  line(heading);
-  for (const auto& row : rows) line(row);
+  std::vector<TextRow> all{heading};
+  all.insert(all.end(), rows.begin(), rows.end());
+  out << tableauAligne(all);
 }
 
 PieceArg findPiece(const std::string& kindText, const std::string& ident) {

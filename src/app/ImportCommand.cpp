@@ -41,40 +41,12 @@ std::string dernierNumeroErreur() {
   return err.lire(4) == 0 ? err.valeur("IDENT").toChaine() : std::string();
 }
 
-// The error rows numbered after `after`, as an aligned table; returns how many.
-size_t imprimerErreurs(const std::string& after, std::ostream& out) {
+// The error rows numbered after `after` (those of this run).
+int64_t erreursApres(const std::string& after) {
   Table err(nullptr, "VOVOVA", "IMM_ERREUR", "COMMANDE");
   err.effacerCriteres();
   if (!after.empty()) err.ajouterCritere("IDENT", '+', Valeur::chaine(after + "\x01"));
-  err.ouvrir();
-  const std::array<const char*, 5> columns{"IDENT", "COMPOSANT", "CODE", "DESIG", "CMT"};
-  std::vector<std::array<std::string, 5>> rows;
-  std::array<size_t, 5> widths{};
-  for (size_t i = 0; i < columns.size(); ++i) widths[i] = std::string(columns[i]).size();
-  auto length = [](const std::string& s) {
-    size_t n = 0;
-    for (unsigned char c : s) n += (c & 0xC0) != 0x80 ? 1 : 0;
-    return n;
-  };
-  while (err.lire(1) == 0) {
-    std::array<std::string, 5> row;
-    for (size_t i = 0; i < columns.size(); ++i) {
-      row[i] = err.valeur(columns[i]).toChaine();
-      if (i + 1 < columns.size()) widths[i] = std::max(widths[i], length(row[i]));
-    }
-    rows.push_back(std::move(row));
-  }
-  if (rows.empty()) return 0;
-  auto print = [&](const std::array<std::string, 5>& cells) {
-    for (size_t i = 0; i < cells.size(); ++i) {
-      out << cells[i];
-      if (i + 1 < cells.size()) out << std::string(widths[i] - length(cells[i]) + 2, ' ');
-    }
-    out << "\n";
-  };
-  print({columns[0], columns[1], columns[2], columns[3], columns[4]});
-  for (const auto& r : rows) print(r);
-  return rows.size();
+  return err.compter();
 }
 
 int importAuto(Session& session, std::ostream& out) {
@@ -133,11 +105,12 @@ int runImport(Session& session, const ImportOptions& o, std::ostream& out) {
   for (const char* field : {"V_ERREUR_DF", "V_ERREUR_CF", "V_ERREUR_BF", "V_ERREUR_FF"}) {
     errors += window->champ(field)->entier();
   }
-  size_t printed = imprimerErreurs(before, out);
-  if (errors == 0 && printed == 0) {
+  // The window has shown this run's errors in its error list: they are not printed again.
+  int64_t recorded = erreursApres(before);
+  if (errors == 0 && recorded == 0) {
     out << (o.checkOnly ? "control done without error\n" : "import done without error\n");
   }
-  return errors == 0 && printed == 0 ? 0 : 1;
+  return errors == 0 && recorded == 0 ? 0 : 1;
 }
 
 }  // namespace quarvo::app

@@ -6,7 +6,7 @@
 //
 // With files, the import window is opened, given exactly those files (the other kinds stay
 // empty) and validated, in control-only mode with --check-only; its messages go through the
-// session's driver and the errors this run recorded are printed as a table. With --auto, the
+// session's driver, among them the window's error list when errors were found. With --auto, the
 // automatic import runs on the default files of the import settings and the command says where
 // its error report went. Exit code 0 when everything was clean, 1 when errors were found or the
 // window refused the files.

@@ -1,9 +1,10 @@
 // Tab-separated rows in and out of a table, through the runtime's cursors.
 //
-// The first line names the columns; each further line is one row. Tabs, line breaks and
-// backslashes inside values are written as \t, \n, \r and \\. Dates are written dd/mm/yyyy and
-// read in that form or ISO; amounts with a decimal point (a comma is read too). A load is all or
-// nothing: the first bad line stops it with a message naming the file, line, column and value.
+// The first record names the columns; each further record is one row, written and read by the
+// tab-separated text rule of the exchange format (host/TexteTabule.h: a value holding a tab, a
+// line break or a quote is quoted). Dates are written dd/mm/yyyy and read in that form or ISO;
+// amounts with a decimal point (a comma is read too). A load is all or nothing: the first bad
+// line stops it with a message naming the file, line, column and value.
 #pragma once
 
 #include <istream>
@@ -23,8 +24,5 @@ size_t loadTsv(host::Session& session, const std::string& table, std::istream& i
 // Prints the rows of `table` matching every COL=VALUE filter, in key order; returns the count.
 size_t dumpTsv(host::Session& session, const std::string& table,
                const std::vector<std::pair<std::string, std::string>>& where, std::ostream& out);
-
-std::string escapeTsv(const std::string& value);
-std::string unescapeTsv(const std::string& value);
 
 }  // namespace quarvo::app

@@ -5,6 +5,8 @@
 #include <fstream>
 #include <set>
 
+#include "host/Texte.h"
+#include "host/TexteTabule.h"
 #include "host/table/Table.h"
 #include "host/value/Identifiant.h"
 
@@ -97,31 +99,11 @@ std::string depuisWindows1252(const std::string& text) {
 // ---------------------------------------------------------------------------------------------
 // Line reader
 
-namespace {
-
-std::string trim(const std::string& s) {
-  size_t b = 0;
-  size_t e = s.size();
-  while (b < e && (s[b] == ' ' || s[b] == '\t')) ++b;
-  while (e > b && (s[e - 1] == ' ' || s[e - 1] == '\t')) --e;
-  return s.substr(b, e - b);
-}
-
-std::string sansGuillemets(const std::string& cell) {
-  if (cell.size() < 2 || cell.front() != '"' || cell.back() != '"') return cell;
-  std::string out;
-  for (size_t i = 1; i + 1 < cell.size(); ++i) {
-    out += cell[i];
-    if (cell[i] == '"' && i + 2 < cell.size() && cell[i + 1] == '"') ++i;
-  }
-  return out;
-}
-
-}  // namespace
-
 bool LecteurTexte::suivante(std::vector<std::string>& cellules, std::string& defaut) {
   cellules.clear();
   defaut.clear();
+  std::string enregistrement;  // a record spans several lines while a quoted cell is open
+  size_t debut = 0;
   while (!binaire_) {
     std::string line;
     bool tropLongue = false;
@@ -138,11 +120,18 @@ bool LecteurTexte::suivante(std::vector<std::string>& cellules, std::string& def
         tropLongue = true;  // the rest of the line is read and dropped
       }
     }
-    if (!lu) return false;
-    ++ligne_;
+    if (!lu) {
+      if (debut == 0) return false;
+      // The file ends inside a quoted cell: the record is what was read.
+      decouperTsv(enregistrement, cellules);
+      ligne_ = debut;
+      return true;
+    }
+    ++lues_;
     if (!line.empty() && line.back() == '\r') line.pop_back();
-    if (ligne_ == 1 && line.rfind("\xEF\xBB\xBF", 0) == 0) line.erase(0, 3);
-    if (tropLongue) {
+    if (lues_ == 1 && line.rfind("\xEF\xBB\xBF", 0) == 0) line.erase(0, 3);
+    if (tropLongue || enregistrement.size() + line.size() > kLigneMax) {
+      ligne_ = debut != 0 ? debut : lues_;
       defaut = "ligne de plus de " + std::to_string(kLigneMax) + " caractères";
       return true;
     }
@@ -150,22 +139,25 @@ bool LecteurTexte::suivante(std::vector<std::string>& cellules, std::string& def
       auto c = static_cast<unsigned char>(ch);
       if (c < 0x20 && ch != '\t') {
         binaire_ = true;
+        ligne_ = lues_;
         defaut = "contenu binaire (caractère de contrôle " + std::to_string(c) +
                  ") : ce n'est pas un fichier texte";
         return true;
       }
     }
-    if (trim(line).empty()) continue;
     if (!valideUtf8(line)) line = depuisWindows1252(line);
-    size_t start = 0;
-    while (true) {
-      size_t tab = line.find('\t', start);
-      std::string cell = line.substr(start, tab == std::string::npos ? tab : tab - start);
-      cellules.push_back(sansGuillemets(trim(cell)));
-      if (tab == std::string::npos) break;
-      start = tab + 1;
+    if (debut == 0) {
+      if (sansBlancs(line).empty()) continue;
+      debut = lues_;
+      enregistrement = std::move(line);
+    } else {
+      enregistrement += '\n';
+      enregistrement += line;
     }
-    return true;
+    if (decouperTsv(enregistrement, cellules)) {
+      ligne_ = debut;
+      return true;
+    }
   }
   return false;
 }
@@ -183,11 +175,7 @@ std::string majuscules(std::string s) {
 }
 
 std::string apercu(const std::string& value) {
-  constexpr size_t kMax = 40;
-  if (value.size() <= kMax) return value;
-  size_t cut = kMax;
-  while (cut > 0 && (static_cast<unsigned char>(value[cut]) & 0xC0) == 0x80) --cut;
-  return value.substr(0, cut) + "…";
+  return host::apercu(value, 40);
 }
 
 std::string attendu(ColKind kind) {
@@ -381,28 +369,23 @@ void ImportTexte::chargerTxt(Automate& commun, Evt* evt) {
   commun.erreurMethode(r.charge ? 0 : 1, evt);
 }
 
-std::vector<std::string> ImportTexte::lignesErreurs(Session&) {
-  std::vector<std::string> out;
+void ImportTexte::consulterErreurs(Automate& commun, Evt* evt) {
+  // One aligned table: its heading, then the first kAfficheMax rows, then their count.
+  std::vector<std::vector<std::string>> rows{{"IDENT", "COMPOSANT", "CODE", "DESIG", "CMT"}};
+  size_t total = 0;
   Table err(nullptr, "VOVOVA", "IMM_ERREUR", "CONSULTATION");
   err.effacerCriteres();
   err.ouvrir();
   while (err.lire(1) == 0) {
-    out.push_back(err.valeur("IDENT").toChaine() + "  " + err.valeur("COMPOSANT").toChaine() +
-                  "  " + err.valeur("CODE").toChaine() + "  " + err.valeur("DESIG").toChaine() +
-                  "  " + err.valeur("CMT").toChaine());
+    if (++total > kAfficheMax) continue;
+    rows.push_back({err.valeur("IDENT").toChaine(), err.valeur("COMPOSANT").toChaine(),
+                    err.valeur("CODE").toChaine(), err.valeur("DESIG").toChaine(),
+                    err.valeur("CMT").toChaine()});
   }
-  return out;
-}
-
-void ImportTexte::consulterErreurs(Automate& commun, Evt* evt) {
-  std::vector<std::string> lines = lignesErreurs(commun.session());
-  std::string text;
-  if (lines.empty()) text = "Aucune erreur.";
-  for (size_t i = 0; i < lines.size() && i < kAfficheMax; ++i) {
-    text += (i ? "\n" : "") + lines[i];
-  }
-  if (lines.size() > kAfficheMax) {
-    text += "\n… et " + std::to_string(lines.size() - kAfficheMax) + " autres erreurs.";
+  std::string text = total == 0 ? "Aucune erreur." : tableauAligne(rows);
+  if (!text.empty() && text.back() == '\n') text.pop_back();
+  if (total > kAfficheMax) {
+    text += "\n… et " + std::to_string(total - kAfficheMax) + " autres erreurs.";
   }
   commun.BoiteDialogue("Liste des erreurs d'import", text, 1, {"$1~OK"});
   commun.erreurMethode(0, evt);
@@ -427,16 +410,10 @@ void ImportTexte::sauverErreurs(Automate& commun, Evt* evt) {
   Table err(nullptr, "VOVOVA", "IMM_ERREUR", "SAUVEGARDE");
   err.effacerCriteres();
   err.ouvrir();
-  auto cell = [](std::string v) {
-    std::replace(v.begin(), v.end(), '\t', ' ');
-    std::replace(v.begin(), v.end(), '\n', ' ');
-    std::replace(v.begin(), v.end(), '\r', ' ');
-    return v;
-  };
   while (err.lire(1) == 0) {
-    out << cell(err.valeur("IDENT").toChaine()) << '\t' << cell(err.valeur("COMPOSANT").toChaine())
-        << '\t' << cell(err.valeur("CODE").toChaine()) << '\t'
-        << cell(err.valeur("DESIG").toChaine()) << '\t' << cell(err.valeur("CMT").toChaine())
+    out << enregistrementTsv({err.valeur("IDENT").toChaine(), err.valeur("COMPOSANT").toChaine(),
+                              err.valeur("CODE").toChaine(), err.valeur("DESIG").toChaine(),
+                              err.valeur("CMT").toChaine()})
         << '\n';
   }
   out.flush();

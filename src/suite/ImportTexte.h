@@ -1,13 +1,14 @@
 // The text-file loader of the shared import service ("COMMUN" "IMPORT_CHARGER_TXT") and the
 // error list of the purchase import ("IMPORT_CONSULTER_ERREURS", "IMPORT_SAUVER_ERREURS").
 //
-// Rule: a file of format "EXCEL1" is tab-separated text. Its first line names staging columns
-// (any order, names compared in upper case; "NUMERO_DOC" is required, "IDENT" and
-// "LIGNE_FICHIER" are the loader's own); each further line is one row. Lines end in LF or
-// CRLF; each line is read as UTF-8 when it is valid UTF-8 and as Windows-1252 otherwise; a
-// leading byte-order mark is dropped; blank lines are skipped; a cell wrapped in double quotes
-// loses them ("" inside stands for one quote); cells are trimmed. Dates are "dd/mm/yyyy" (ISO is
-// read too), numbers take a decimal comma or point.
+// Rule: a file of format "EXCEL1" is tab-separated text, read by the exchange format's rule
+// (host/TexteTabule.h: quoted cells may hold tabs and line breaks; blanks around cells are not
+// part of them). Its first record names staging columns (any order, names compared in upper
+// case; "NUMERO_DOC" is required, "IDENT" and "LIGNE_FICHIER" are the loader's own); each
+// further record is one row, numbered by the line it starts on. Lines end in LF or CRLF; each
+// line is read as UTF-8 when it is valid UTF-8 and as Windows-1252 otherwise; a leading
+// byte-order mark is dropped; blank lines are skipped. Dates are "dd/mm/yyyy" (ISO is read too),
+// numbers take a decimal comma or point.
 //
 // A load is whole or nothing: the staging table is emptied and refilled in one transaction that
 // commits only when every line was sound. Otherwise nothing changes in the staging table and one
@@ -20,8 +21,9 @@
 // "IMPORT_CHARGER_TXT" (table, path, mode, error flag by reference): the flag becomes 0 when
 // the file was loaded, 1 otherwise; the mode ("M" in unattended runs) changes nothing here, as
 // the loader never asks anything. "IMPORT_CONSULTER_ERREURS" (empty, "ach") shows every row of
-// "IMM_ERREUR" in one message box (the first kAfficheMax rows, then their count).
-// "IMPORT_SAUVER_ERREURS" (path, option) writes the rows, tab-separated with a header line, to
+// "IMM_ERREUR" in one message box, as an aligned table under its heading (the first kAfficheMax
+// rows, then their count).
+// "IMPORT_SAUVER_ERREURS" (path, option) writes the rows, by the same rule with a header line, to
 // the file, creating its folder; option "O" appends to an existing file (several runs of one
 // day share one report), anything else replaces it. It fails when the file cannot be written.
 #pragma once
@@ -37,16 +39,16 @@
 
 namespace quarvo::suite {
 
-// Splits a stream into the cells of its lines, in UTF-8. Holds one line at a time.
+// Splits a stream into the cells of its records, in UTF-8. Holds one record at a time.
 class LecteurTexte {
  public:
   static constexpr size_t kLigneMax = 64 * 1024;
 
   explicit LecteurTexte(std::istream& in) : in_(in) {}
-  // The next non-blank line: true with its cells, or false at the end of the stream. A line
+  // The next non-blank record: true with its cells, or false at the end of the stream. A line
   // that cannot be read gives true with `defaut` set (and no cells).
   bool suivante(std::vector<std::string>& cellules, std::string& defaut);
-  // Number of the line last returned (1-based).
+  // Number of the line the record last returned starts on (1-based).
   size_t ligne() const { return ligne_; }
   // True when the stream turned out to be binary data (reading then stops).
   bool binaire() const { return binaire_; }
@@ -54,6 +56,7 @@ class LecteurTexte {
  private:
   std::istream& in_;
   size_t ligne_ = 0;
+  size_t lues_ = 0;  // lines read so far
   bool binaire_ = false;
 };
 
@@ -89,8 +92,6 @@ class ImportTexte {
   static void consulterErreurs(host::Automate& commun, host::Evt* evt);
   static void sauverErreurs(host::Automate& commun, host::Evt* evt);
 
-  // The error rows as display lines ("0000000001  IMM_PIECE_FF  F001  ...  text").
-  static std::vector<std::string> lignesErreurs(host::Session& session);
   // Next free error number (after the highest "IDENT" of "IMM_ERREUR"), as ten digits.
   static std::string prochainNumeroErreur(host::Session& session);
 };

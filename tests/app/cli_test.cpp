@@ -71,19 +71,20 @@ TEST_F(CliTest, InitIsIdempotentAndRefusesForeignFiles) {
 
 TEST_F(CliTest, LoadAndDumpRoundTripAndBadLinesLoadNothing) {
   ASSERT_EQ(quarvo("init").code, 0);
-  write("chain.tsv",
-        "CLE_SRC\tTYPE_DST\tIDE_DST\n-2|0000000001|1\t-3\tB\\twith tab\n-2|0000000002|1\t-4\tF\n");
+  write(
+      "chain.tsv",
+      "CLE_SRC\tTYPE_DST\tIDE_DST\n-2|0000000001|1\t-3\t\"B\twith tab\"\n-2|0000000002|1\t-4\tF\n");
   Result r = quarvo("load CHAINAGE " + (dir_ / "chain.tsv").string());
   EXPECT_EQ(r.code, 0) << r.out;
   Result dump = quarvo("dump CHAINAGE");
-  EXPECT_NE(dump.out.find("B\\twith tab"), std::string::npos);
+  EXPECT_NE(dump.out.find("\"B\twith tab\""), std::string::npos) << dump.out;
   write("dump.tsv", dump.out);
   ASSERT_EQ(quarvo("init").code, 0);
   db_ = (dir_ / "second.db").string();
   ASSERT_EQ(quarvo("init").code, 0);
   ASSERT_EQ(quarvo("load CHAINAGE " + (dir_ / "dump.tsv").string()).code, 0);
   EXPECT_EQ(quarvo("dump CHAINAGE").out, dump.out);
-  EXPECT_EQ(quarvo("dump CHAINAGE --where TYPE_DST=-4").out.find("B\\t"), std::string::npos);
+  EXPECT_EQ(quarvo("dump CHAINAGE --where TYPE_DST=-4").out.find("B\t"), std::string::npos);
 
   write("bad.tsv", "CLE_SRC\tTYPE_DST\tIDE_DST\n-2|9|1\t-3\tX\n-2|9|2\ttrois\tY\n");
   r = quarvo("load CHAINAGE " + (dir_ / "bad.tsv").string());
@@ -112,6 +113,15 @@ TEST_F(CliTest, RunPrintsResultsAndOutcome) {
   EXPECT_EQ(quarvo("run QUARVO-NOTHING").code, 2);
   EXPECT_EQ(quarvo("call NOMODULE LECTURE 1").code, 2);
   EXPECT_NE(quarvo("automata").out.find("QUARVO-EXISTE_CHAINAGE_AVAL\n"), std::string::npos);
+
+  // A dialog's answer is a button's number, whole, or its text; anything else refuses (the
+  // last button), as when no answer is left.
+  const std::string choix = " call COMMUN MESS_CHOIX 1 \"\" A B C";
+  EXPECT_NE(quarvo("--answer 2" + choix).out.find("1=2\n"), std::string::npos);
+  EXPECT_NE(quarvo("--answer B" + choix).out.find("1=2\n"), std::string::npos);
+  EXPECT_NE(quarvo("--answer 2x" + choix).out.find("1=3\n"), std::string::npos);
+  EXPECT_NE(quarvo("--answer 9" + choix).out.find("1=3\n"), std::string::npos);
+  EXPECT_NE(quarvo(choix).out.find("1=3\n"), std::string::npos);
 }
 
 TEST_F(CliTest, CheckFindsAPlantedDriftAndFixRemovesIt) {

@@ -65,13 +65,13 @@ TEST(ExportTest, WritesZonesInSortPlanOrderAsExchangeText) {
   auto file = t.dir() / "a" / "export.txt";
   ASSERT_EQ(exporter(file.string(), "SI"), 0);
   // Digit runs sort as numbers ("|2" before "|10"); "BUD_UNIQ" stands for "BUD_IDENT"; the key
-  // only breaks ties. Tabs inside a text would shift the columns: they become spaces.
+  // only breaks ties. A text holding a tab is quoted, as the loader and spreadsheets read it.
   EXPECT_EQ(lire(file),
             "NUMERO\tTEXTE\tMONTANT\tJOUR\tV_CALC\r\n"
             "0000000200|9\tÉté\t1234567.89\t05/05/2026\tcalculé\r\n"
             "0000000201|2\tdeux bis\t0.00\t05/05/2026\tcalculé\r\n"
             "0000000201|2\tdeux\t-2.50\t05/05/2026\tcalculé\r\n"
-            "0000000201|10\tdix avec tabulation\t10.50\t05/05/2026\tcalculé\r\n");
+            "0000000201|10\t\"dix\tavec tabulation\"\t10.50\t05/05/2026\tcalculé\r\n");
   // Without "S" the rows are added to the existing file, without a second header.
   ASSERT_EQ(exporter(file.string(), "I"), 0);
   std::string twice = lire(file);

@@ -37,13 +37,18 @@ TEST(ImportTexteTest, LoadsCrlfWindows1252AnyColumnOrderAndReplacesTheStagedFile
       "DESIG\tnumero_doc\tQTE\tPUHT\tDATE_CREATION\tSOLDE\r\n"
       "Coude \xE9quip\xE9\tC1\t2,5\t180.50\t01/12/2026\t1\r\n"
       "\r\n"
-      "\"Tube \"\"PER\"\"\"\tC2\t3\t 12,125 \t2026-11-30\t0\n";
+      "\"Tube \"\"PER\"\"\"\tC2\t3\t 12,125 \t2026-11-30\t0\n"
+      // A quoted designation may hold a tab and a line break; rows keep the line they start on.
+      "\"Coude\tdouble\r\nsur deux lignes\"\tC3\t1\t1\t01/12/2026\t0\r\n"
+      "Manchon\tC4\t1\t2\t01/12/2026\t0\n";
   auto good = ecrireFichier(t, "cf2.TXT", file);
   EXPECT_EQ(charger(t, "IMM_PIECE_CF", good.string()), 0);
   EXPECT_EQ(requete(t, R"(SELECT IDENT, NUMERO_DOC, DESIG, QTE, PUHT, DATE_CREATION, SOLDE,
                               LIGNE_FICHIER FROM "IMM_PIECE_CF" ORDER BY IDENT)"),
             "0000000001|C1|Coude équipé|2.5|180.50|2026-12-01|1|2\n"
-            "0000000002|C2|Tube \"PER\"|3.0|12.125|2026-11-30|0|4\n");
+            "0000000002|C2|Tube \"PER\"|3.0|12.125|2026-11-30|0|4\n"
+            "0000000003|C3|Coude\tdouble\nsur deux lignes|1.0|1.00|2026-12-01|0|5\n"
+            "0000000004|C4|Manchon|1.0|2.00|2026-12-01|0|7\n");
 }
 
 TEST(ImportTexteTest, EveryFaultNamesFileLineColumnAndValueAndStagesNothing) {
@@ -131,12 +136,19 @@ TEST(ImportTexteTest, ErrorListIsShownAndSavedOrAppended) {
   t.session().appelerProcedure("COMMUN", "IMPORT_CONSULTER_ERREURS", &show);
   t.sql(
       R"(INSERT INTO "IMM_ERREUR" VALUES ('0000000001', 'IMM_PIECE_FF', 'F1', 'Facture fournisseur no F1',
-             'Code fournisseur <X> inexistant'))");
+             'Code fournisseur <X> inexistant'),
+             ('0000000002', 'IMM_PIECE_FF', 'F22', 'Fichier ff.txt, ligne 3',
+              'colonne DESIG, valeur "a	b" : refusée'))");
   t.session().appelerProcedure("COMMUN", "IMPORT_CONSULTER_ERREURS", &show);
+  // One aligned table under its heading.
   EXPECT_EQ(t.ui().transcriptText(),
             "MESSAGE Liste des erreurs d'import | Aucune erreur. | [OK]\n"
-            "MESSAGE Liste des erreurs d'import | 0000000001  IMM_PIECE_FF  F1  Facture "
-            "fournisseur no F1  Code fournisseur <X> inexistant | [OK]\n");
+            "MESSAGE Liste des erreurs d'import | "
+            "IDENT       COMPOSANT     CODE  DESIG                      CMT\n"
+            "0000000001  IMM_PIECE_FF  F1    Facture fournisseur no F1  Code fournisseur <X> "
+            "inexistant\n"
+            "0000000002  IMM_PIECE_FF  F22   Fichier ff.txt, ligne 3    colonne DESIG, valeur "
+            "\"a\tb\" : refusée | [OK]\n");
 
   auto report = t.dir() / "rapports" / "erreurs.txt";
   host::EvtParamVal save{host::val(report.string()), host::val("O")};
@@ -145,10 +157,13 @@ TEST(ImportTexteTest, ErrorListIsShownAndSavedOrAppended) {
   std::ifstream in(report);
   std::stringstream text;
   text << in.rdbuf();
-  std::string line =
+  // Written by the exchange format's rule: the value holding a tab is quoted, not altered.
+  std::string lines =
       "0000000001\tIMM_PIECE_FF\tF1\tFacture fournisseur no F1\tCode fournisseur <X> "
-      "inexistant\n";
-  EXPECT_EQ(text.str(), "IDENT\tCOMPOSANT\tCODE\tDESIG\tCMT\n" + line + line);
+      "inexistant\n"
+      "0000000002\tIMM_PIECE_FF\tF22\tFichier ff.txt, ligne 3\t\"colonne DESIG, valeur "
+      "\"\"a\tb\"\" : refusée\"\n";
+  EXPECT_EQ(text.str(), "IDENT\tCOMPOSANT\tCODE\tDESIG\tCMT\n" + lines + lines);
 
   host::EvtParamVal unwritable{host::val((t.dir() / "rapports").string()), host::val("")};
   EXPECT_EQ(t.session().appelerProcedure("COMMUN", "IMPORT_SAUVER_ERREURS", &unwritable), 1);

@@ -6,6 +6,9 @@
 #include <cctype>
 #include <fstream>
 
+#include "host/Texte.h"
+#include "host/TexteTabule.h"
+
 namespace quarvo::host::report {
 
 namespace fs = std::filesystem;
@@ -54,10 +57,13 @@ class ClasseurTexte : public Classeur {
     ligne(cells);
   }
   void ligne(const std::vector<Valeur>& cells) override {
+    // A one-character separator follows the exchange format's quoting rule; a longer one is
+    // taken as the column boundary and tabs decide the quoting.
+    char sep = format_.separateur.size() == 1 ? format_.separateur[0] : '\t';
     std::string line;
     for (size_t i = 0; i < cells.size(); ++i) {
       if (i > 0) line += format_.separateur;
-      line += texteCellule(cells[i], format_);
+      line += celluleTsv(texteCellule(cells[i], format_), sep);
     }
     out_ << line << "\r\n";
   }
@@ -147,7 +153,7 @@ class ClasseurXlsx : public Classeur {
         case Kind::Chaine:
           if (!v.asChaine().empty()) {
             worksheet_write_string(sheet_, row_, col, v.asChaine().c_str(), nullptr);
-            largeur(c, caracteres(v.asChaine()));
+            largeur(c, nombreCaracteres(v.asChaine()));
           }
           break;
       }
@@ -176,11 +182,6 @@ class ClasseurXlsx : public Classeur {
   }
 
  private:
-  static size_t caracteres(const std::string& s) {
-    size_t n = 0;
-    for (unsigned char ch : s) n += (ch & 0xC0) != 0x80 ? 1 : 0;
-    return n;
-  }
   void largeur(size_t c, size_t w) {
     if (widths_.size() <= c) widths_.resize(c + 1, 8);
     widths_[c] = std::max(widths_[c], w);
@@ -224,11 +225,6 @@ std::string texteCellule(const Valeur& v, const FormatEchange& format) {
     default:
       text = v.toChaine();
       break;
-  }
-  for (char& c : text) {
-    if (c == '\t' || c == '\n' || c == '\r' ||
-        (format.separateur.size() == 1 && c == format.separateur[0]))
-      c = ' ';
   }
   return text;
 }

@@ -38,7 +38,7 @@ class Classeur {
   virtual bool fermer(std::string& error) = 0;
 };
 
-// The text of one cell in a text exchange file.
+// The text of one cell in a text exchange file, before the quoting of the exchange format.
 std::string texteCellule(const Valeur& v, const FormatEchange& format);
 
 }  // namespace quarvo::host::report

@@ -6,6 +6,8 @@
 #include <algorithm>
 #include <map>
 
+#include "host/Texte.h"
+
 // Fontconfig keeps its font configuration for the life of the process (Pango's font map holds
 // it and is never released); the leak checker of sanitizer builds must not count it as ours.
 #if defined(__SANITIZE_ADDRESS__)
@@ -147,12 +149,8 @@ struct Document::Impl {
                  double largeur) {
     // A text too short to reach the cell's width even in its widest glyphs takes one line:
     // only the others go through the text layout.
-    size_t chars = 0;
-    bool saut = false;
-    for (unsigned char c : texte) {
-      chars += (c & 0xC0) != 0x80 ? 1 : 0;
-      saut |= c == '\n';
-    }
+    size_t chars = nombreCaracteres(texte);
+    bool saut = texte.find('\n') != std::string::npos;
     if (!saut && static_cast<double>(chars) * taille * 1.2 <= largeur) {
       int key = static_cast<int>(taille * 10) * 4 + (gras ? 2 : 0) + (italique ? 1 : 0);
       auto it = hauteurLigne.find(key);

@@ -1,10 +1,8 @@
 // A driver for tests and scripted runs: answers come from a queue, everything shown is written
 // to a transcript, one line per event ("MESSAGE Attention | texte | [OK]", "GAUGE 3/10").
-// With no answer queued, a dialog gets its last button (the refusal: "Non", "Annuler") and a
-// chooser gets nothing.
+// Answers are taken by the rule of `Reponses`: with no answer queued, a dialog gets its last
+// button (the refusal: "Non", "Annuler") and a chooser gets nothing.
 #pragma once
-
-#include <deque>
 
 #include "host/ui/UiDriver.h"
 
@@ -12,7 +10,7 @@ namespace quarvo::host {
 
 class ScriptedDriver : public UiDriver {
  public:
-  void repondre(std::string answer) { answers_.push_back(std::move(answer)); }
+  void repondre(std::string answer) { answers_.ajouter(std::move(answer)); }
   const std::vector<std::string>& transcript() const { return transcript_; }
   std::string transcriptText() const;
   void clear() { transcript_.clear(); }
@@ -32,8 +30,7 @@ class ScriptedDriver : public UiDriver {
   void incident(const std::string& text) override;
 
  private:
-  std::optional<std::string> next();
-  std::deque<std::string> answers_;
+  Reponses answers_;
   std::vector<std::string> transcript_;
   bool gaugeDetail_ = false;
   std::string lastGauge_;

@@ -1,19 +1,10 @@
 #include "host/ui/TerminalDriver.h"
 
-#include <charconv>
-
 namespace quarvo::host {
 
 TerminalDriver::TerminalDriver(std::ostream& out, std::deque<std::string> answers,
                                bool interactiveBar)
     : out_(out), answers_(std::move(answers)), bar_(interactiveBar) {}
-
-std::optional<std::string> TerminalDriver::next() {
-  if (answers_.empty()) return std::nullopt;
-  std::string a = answers_.front();
-  answers_.pop_front();
-  return a;
-}
 
 int TerminalDriver::boiteDialogue(const std::string& title, const std::string& text, int,
                                   const std::vector<std::string>& buttons) {
@@ -21,37 +12,37 @@ int TerminalDriver::boiteDialogue(const std::string& title, const std::string& t
     out_ << "\n";
     drawn_ = false;
   }
-  out_ << title << " : " << text << "\n";
-  if (buttons.size() <= 1) return 1;
-  int chosen = static_cast<int>(buttons.size());
-  if (auto answer = next()) {
-    int n = 0;
-    auto [p, ec] = std::from_chars(answer->data(), answer->data() + answer->size(), n);
-    if (ec == std::errc() && n >= 1 && n <= static_cast<int>(buttons.size())) chosen = n;
-    for (size_t i = 0; i < buttons.size(); ++i) {
-      if (buttonText(buttons[i]) == *answer) chosen = static_cast<int>(i) + 1;
+  // A text of several lines (a list) goes under its title, indented.
+  if (text.find('\n') == std::string::npos) {
+    out_ << title << " : " << text << "\n";
+  } else {
+    out_ << title << " :\n";
+    size_t start = 0;
+    while (start <= text.size()) {
+      size_t end = text.find('\n', start);
+      if (end == std::string::npos) end = text.size();
+      out_ << "   " << text.substr(start, end - start) << "\n";
+      start = end + 1;
     }
   }
+  if (buttons.size() <= 1) return 1;
+  int chosen = Reponses::bouton(answers_.suivante(), buttons);
   out_ << "  -> " << buttonText(buttons[static_cast<size_t>(chosen) - 1]) << "\n";
   return chosen;
 }
 
 std::optional<std::string> TerminalDriver::choisirFichier(const std::string& title,
                                                           const std::string&) {
-  auto answer = next();
+  auto answer = answers_.suivante();
   out_ << title << " -> " << answer.value_or("(aucun)") << "\n";
   return answer;
 }
 
 std::optional<int> TerminalDriver::choisir(const std::string& title,
                                            const std::vector<std::string>& items) {
-  auto answer = next();
+  auto answer = answers_.suivante();
   out_ << title << " -> " << answer.value_or("(aucun)") << "\n";
-  if (!answer) return std::nullopt;
-  int n = 0;
-  std::from_chars(answer->data(), answer->data() + answer->size(), n);
-  if (n < 1 || n > static_cast<int>(items.size())) return std::nullopt;
-  return n;
+  return Reponses::element(answer, items.size());
 }
 
 void TerminalDriver::attenteTitre(const std::string& title) {

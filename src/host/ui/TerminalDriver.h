@@ -1,5 +1,5 @@
 // The command line's driver: messages are printed on stderr with their title; questions take
-// the next answer given on the command line (--answer), else the refusal (last button); the
+// the next answer given on the command line (--answer) by the rule of `Reponses`; the
 // waiting box is a progress bar on stderr (redrawn in place on a terminal; otherwise its title
 // and a line at each quarter).
 #pragma once
@@ -29,9 +29,8 @@ class TerminalDriver : public UiDriver {
   void incident(const std::string& text) override;
 
  private:
-  std::optional<std::string> next();
   std::ostream& out_;
-  std::deque<std::string> answers_;
+  Reponses answers_;
   bool bar_;
   std::string title_;
   int lastPercent_ = -1;

@@ -6,6 +6,7 @@
 #pragma once
 
 #include <cstdint>
+#include <deque>
 #include <optional>
 #include <string>
 #include <vector>
@@ -32,5 +33,29 @@ class UiDriver {
 
 // "$1~OK" → "OK".
 std::string buttonText(const std::string& button);
+
+// Answers given before they are asked for (a script, the command line's --answer), taken in
+// order, by one rule whichever driver takes them:
+// - a message box: an answer that is, whole, the number of a button chooses it ("2"); else an
+//   answer that is a button's text chooses that button ("Oui"); an answer that names no button
+//   ("2x", "peut-être"), like no answer at all, refuses: the last button;
+// - a choice list: an answer that is, whole, the number of an item chooses it; anything else
+//   chooses nothing;
+// - a file chooser: the answer is the path.
+class Reponses {
+ public:
+  explicit Reponses(std::deque<std::string> answers = {}) : answers_(std::move(answers)) {}
+  void ajouter(std::string answer) { answers_.push_back(std::move(answer)); }
+  // The next answer, taken from the queue; nothing when none is left.
+  std::optional<std::string> suivante();
+  // The button (1-based) that `answer` chooses among `buttons` (at least one).
+  static int bouton(const std::optional<std::string>& answer,
+                    const std::vector<std::string>& buttons);
+  // The item (1-based) that `answer` chooses among `count`, if any.
+  static std::optional<int> element(const std::optional<std::string>& answer, size_t count);
+
+ private:
+  std::deque<std::string> answers_;
+};
 
 }  // namespace quarvo::host

@@ -4,6 +4,8 @@
 #include <cstdio>
 #include <ctime>
 
+#include "host/Texte.h"
+
 namespace quarvo::host {
 
 namespace chr = std::chrono;
@@ -50,8 +52,7 @@ Date Date::of(int year, unsigned month, unsigned day) {
 }
 
 std::optional<Date> Date::parse(std::string_view text) {
-  while (!text.empty() && (text.front() == ' ' || text.front() == '\t')) text.remove_prefix(1);
-  while (!text.empty() && (text.back() == ' ' || text.back() == '\t')) text.remove_suffix(1);
+  text = sansBlancs(text);
   if (text.empty()) return Date();
 
   std::string_view parts[3];

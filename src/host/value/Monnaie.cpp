@@ -6,6 +6,8 @@
 #include <stdexcept>
 #include <system_error>
 
+#include "host/Texte.h"
+
 namespace quarvo::host {
 
 namespace {
@@ -50,14 +52,8 @@ bool isDigit(char c) {
   return c >= '0' && c <= '9';
 }
 
-std::string_view trimSpaces(std::string_view s) {
-  while (!s.empty() && (s.front() == ' ' || s.front() == '\t')) s.remove_prefix(1);
-  while (!s.empty() && (s.back() == ' ' || s.back() == '\t')) s.remove_suffix(1);
-  return s;
-}
-
 std::optional<DecimalText> readDecimal(std::string_view s) {
-  s = trimSpaces(s);
+  s = sansBlancs(s);
   DecimalText d;
   size_t i = 0;
   if (i < s.size() && (s[i] == '+' || s[i] == '-')) d.negative = s[i++] == '-';

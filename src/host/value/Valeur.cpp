@@ -6,6 +6,8 @@
 #include <limits>
 #include <system_error>
 
+#include "host/Texte.h"
+
 namespace quarvo::host {
 
 namespace {
@@ -15,12 +17,6 @@ using Wide = __int128;
 template <typename T>
 int sign(T a, T b) {
   return a < b ? -1 : (b < a ? 1 : 0);
-}
-
-std::string_view trimSpaces(std::string_view s) {
-  while (!s.empty() && (s.front() == ' ' || s.front() == '\t')) s.remove_prefix(1);
-  while (!s.empty() && (s.back() == ' ' || s.back() == '\t')) s.remove_suffix(1);
-  return s;
 }
 
 bool isDigit(char c) {
@@ -61,7 +57,7 @@ std::optional<int64_t> roundToEntier(double v) {
 }
 
 std::optional<int64_t> textToEntier(std::string_view s) {
-  s = trimSpaces(s);
+  s = sansBlancs(s);
   if (s.empty()) return 0;
   std::string digits;
   if (s.front() == '+' || s.front() == '-') {
@@ -83,7 +79,7 @@ std::optional<int64_t> textToEntier(std::string_view s) {
 // magnitudes). Blank text is 0.
 template <typename F>
 std::optional<F> textToFloating(std::string_view s) {
-  s = trimSpaces(s);
+  s = sansBlancs(s);
   if (s.empty()) return F(0);
   std::string text;
   size_t i = 0;
@@ -125,7 +121,7 @@ std::optional<Valeur> fromText(const std::string& s, Kind target) {
       if (auto f = textToFloating<float>(s)) return Valeur::simple(*f);
       return std::nullopt;
     case Kind::Monnaie:
-      if (trimSpaces(s).empty()) return Valeur::monnaie(Monnaie());
+      if (sansBlancs(s).empty()) return Valeur::monnaie(Monnaie());
       if (auto m = Monnaie::parse(s)) return Valeur::monnaie(*m);
       return std::nullopt;
     case Kind::Date:

@@ -6,6 +6,7 @@
 #include <cstdint>
 #include <string>
 
+#include "host/Texte.h"
 #include "host/value/Date.h"
 
 namespace quarvo::import {
@@ -16,33 +17,9 @@ inline int64_t enNombre(const std::string& text) {
   return n;
 }
 
-// Byte offsets of the UTF-8 characters of `s` (plus its size at the end).
-inline std::string derniersCaracteres(const std::string& s, size_t count) {
-  size_t chars = 0;
-  for (unsigned char c : s) chars += (c & 0xC0) != 0x80 ? 1 : 0;
-  if (chars <= count) return s;
-  size_t skip = chars - count;
-  size_t i = 0;
-  while (i < s.size()) {
-    if ((static_cast<unsigned char>(s[i]) & 0xC0) != 0x80) {
-      if (skip == 0) break;
-      --skip;
-    }
-    ++i;
-  }
-  return s.substr(i);
-}
-
-// Characters `from` to `to` (1-based, inclusive) of `s`, as the 4GL's substring.
-inline std::string caracteres(const std::string& s, size_t from, size_t to) {
-  std::string out;
-  size_t index = 0;
-  for (size_t i = 0; i < s.size(); ++i) {
-    if ((static_cast<unsigned char>(s[i]) & 0xC0) != 0x80) ++index;
-    if (index >= from && index <= to) out += s[i];
-  }
-  return out;
-}
+// Characters of a text, counted as characters (the runtime's rule).
+using host::caracteres;
+using host::derniersCaracteres;
 
 // Last day of the month of a "mmyyyy" period ("122026" gives 31/12/2026); empty when the
 // period does not read as one.

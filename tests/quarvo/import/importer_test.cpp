@@ -142,10 +142,9 @@ TEST(ImporterTest, ControlOnlyKeepsFilesAndImportDeletesOnlyCleanOnes) {
     }
     return out;
   }();
-  // The list shows one error per line; its first line is the first error of the table.
+  // The list is an aligned table, one error per line under its heading.
   std::string premiere =
-      "0000000001  IMM_PIECE_FF  FA26200002  Facture fournisseur no FA26200002  Code fournisseur "
-      "<NOBODY> inexistant";
+      "IDENT       COMPOSANT     CODE        DESIG                              CMT";
   EXPECT_EQ(
       messages,
       "MESSAGE Information | [114] Contrôle terminé : des erreurs ont été trouvées. Consultez la "
@@ -157,7 +156,10 @@ TEST(ImporterTest, ControlOnlyKeepsFilesAndImportDeletesOnlyCleanOnes) {
           "n'ont pas été créées et leurs fichiers sont conservés. Consultez la liste des erreurs.\n"
           "MESSAGE Liste des erreurs d'import | " +
           premiere + "\n");
-  EXPECT_NE(transcript.find("Code fournisseur <NOBODY> inexistant"), std::string::npos);
+  EXPECT_NE(transcript.find("\n0000000001  IMM_PIECE_FF  FA26200002  Facture fournisseur no "
+                            "FA26200002  Code fournisseur <NOBODY> inexistant\n"),
+            std::string::npos)
+      << transcript;
 
   // A file that passes the control but whose generation fails is kept for the next run.
   test::ecrireFichier(t, "df.Txt", devisSain());
