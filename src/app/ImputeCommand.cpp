@@ -5,6 +5,7 @@
 #include "app/Console.h"
 #include "app/Workspace.h"
 #include "host/automate/Automate.h"
+#include "host/table/Database.h"
 #include "host/table/Table.h"
 
 namespace quarvo::app {
@@ -34,17 +35,30 @@ std::string finDuMoisCourant(Session& s) {
   return first ? first->lastOfMonth().text() : "";
 }
 
-int64_t linkRows() {
-  Table links(nullptr, "VOVOVA", "QUARVO", "RESUME");
-  return links.compter();
-}
+// What this run did, from the records the writer leaves on each pointed piece.
+struct Bilan {
+  int64_t pointees = 0;
+  int64_t imputables = 0;
+  int64_t ecrites = 0;
+  int64_t dejaLiees = 0;
+  int64_t liens = 0;
+  Monnaie montant;
+};
 
-Monnaie linkTotal() {
-  Table links(nullptr, "VOVOVA", "QUARVO", "RESUME");
-  links.ouvrir();
-  Monnaie total;
-  while (links.lire(1) == 0) total += toMonnaie(links.valeur("HT"));
-  return total;
+Bilan bilan() {
+  Bilan b;
+  Table pieces(nullptr, "VOVOVA", "M_EAPPR", "RESUME");
+  pieces.ouvrir();
+  while (pieces.lire(1) == 0) {
+    ++b.pointees;
+    if (pieces.valeur("IMPUTATION").toChaine() == "O") ++b.imputables;
+    std::string ecriture = pieces.valeur("ECRITURE").toChaine();
+    if (ecriture == "ECRITE") ++b.ecrites;
+    if (ecriture == "DEJA_LIEE") ++b.dejaLiees;
+    b.liens += toEntier(pieces.valeur("LIENS_CREES"));
+    b.montant += toMonnaie(pieces.valeur("HT_LIE"));
+  }
+  return b;
 }
 
 void printProposal(std::ostream& out) {
@@ -83,8 +97,6 @@ void printProposal(std::ostream& out) {
 
 int runImpute(Session& s, const ImputeOptions& o, std::ostream& out) {
   Session::Scope scope(s);
-  int64_t linksBefore = linkRows();
-  Monnaie totalBefore = linkTotal();
   if (!o.selection()) {
     if (s.appelerModule("QUARVO-IMPUTER_AUTO", nullptr) != 0) {
       throw UsageError("the automatic imputation could not start (is the company readable?)");
@@ -110,22 +122,27 @@ int runImpute(Session& s, const ImputeOptions& o, std::ostream& out) {
                           val(min),
                           val(max),
                           val(o.project.value_or(""))};
-    s.appelerModule("QUARVO-POINTER_PIECES", &selection);
-    if (o.dryRun)
+    if (o.dryRun) {
+      // The pointing may create a missing budget line under arbitration: a dry run keeps none
+      // of it.
+      Transaction apercu(s.db());
+      s.appelerModule("QUARVO-POINTER_PIECES", &selection);
       printProposal(out);
-    else
+    } else {
+      s.appelerModule("QUARVO-POINTER_PIECES", &selection);
       s.appelerModule("QUARVO-IMPUTER_PIECES", nullptr);
+    }
   }
-  Table pieces(nullptr, "VOVOVA", "M_EAPPR", "RESUME");
-  int64_t pointed = pieces.compter();
-  pieces.ajouterCritere("IMPUTATION", '=', Valeur::chaine("O"));
-  int64_t imputable = pieces.compter();
-  int64_t linksAfter = linkRows();
-  out << "Pieces pointed: " << pointed << "; " << (o.dryRun ? "imputable: " : "imputed: ")
-      << imputable << "; in error: " << pointed - imputable
-      << "; link rows written: " << (o.dryRun ? 0 : linksAfter - linksBefore) << " new";
-  if (!o.dryRun) out << " (linked amount " << (linkTotal() - totalBefore).text() << ")";
+  Bilan b = bilan();
+  out << "Pieces pointed: " << b.pointees << "; " << (o.dryRun ? "imputable: " : "imputed: ")
+      << (o.dryRun ? b.imputables : b.ecrites) << "; in error: " << b.pointees - b.imputables
+      << "; link rows written: " << b.liens << " new";
+  if (!o.dryRun) out << " (linked amount " << b.montant.text() << ")";
   out << "\n";
+  if (b.dejaLiees > 0) {
+    out << b.dejaLiees
+        << " piece(s) left as they were: linked by another job since they were pointed\n";
+  }
   return 0;
 }
 

@@ -27,35 +27,68 @@ QUARVOImputer_pieces::QUARVOImputer_pieces(Evt* evt)
   addBranch("MAJ_LIENS", [this](Evt* e) { maj_liens(e); });
 }
 
+namespace {
+
+// A piece's version: the day and time of its last change.
+std::string version(Table& t) {
+  return toDate(t.valeur("DATE_MAJ")).text() + t.valeur("HEURE_MAJ").toChaine();
+}
+
+}  // namespace
+
 void QUARVOImputer_pieces::faire(Evt* evt) {
   eappr_.effacerCriteres();
   eappr_.ajouterCritere("IMPUTATION", '=', Valeur::chaine("O"));
   eappr_.ouvrir();
   while (eappr_.lire(1) == 0) {
     // A piece is written whole or not at all: a run cut short leaves no half-linked piece
-    // that the next pointing would take for an unchanged one.
+    // that the next pointing would take for an unchanged one. Its transaction is a write
+    // transaction from its start, so one writer at a time decides what the piece still needs.
+    liensCrees_ = 0;
+    htLie_ = Monnaie();
     Transaction piece(session().db());
-    lappr_.chercher(3, "NUMERO", '/', Valeur::chaine(eappr_.valeur("IDENT").toChaine() + "|"));
-    lappr_.ouvrir();
-    while (lappr_.lire(1) == 0) {
-      std::string key =
-          lappr_.valeur("COMPOSANT").toChaine() + "|" + lappr_.valeur("COMPOSANT_IDENT").toChaine();
-      vappr_.chercher(3, "IDENT", '=', Valeur::chaine(key));
-      vappr_.ouvrir();
-      while (vappr_.lire(1) == 0) {
-        if (toDouble(vappr_.valeur("QTE")) == 0) continue;
-        if (appeler(*this, "AFAFFA", "LECTURE", {vappr_.valeur("AFAFFA_IDENT")}) != 0) continue;
-        if (appeler(*this, "AFLBUD", "LECTURE", {vappr_.valeur("AFLBUD_IDENT")}) != 0) continue;
-        if (appeler(*this, "AFPRES", "LECTURE", {iAflbud_.valeur("AFPRES_IDENT")}) != 0) continue;
-        appelerProcedure("", "", "", "SUPPRESSION_MAJ_LIENS", evt, 0);
-        appelerProcedure("", "", "", "MAJ_QUARVO", evt, 0);
-        appelerProcedure("", "", "", "MAJ_LIENS", evt, 0);
-      }
-    }
+    std::string resultat = ecrirePiece(evt);
     piece.commit();
+    // What this run wrote, for its summary.
+    eappr_.ecrire("ECRITURE", Valeur::chaine(resultat));
+    eappr_.ecrire("LIENS_CREES", Valeur::entier(liensCrees_));
+    eappr_.ecrire("HT_LIE", Valeur::monnaie(htLie_));
+    eappr_.modifier();
   }
   erreurMethode(0, evt);
   sortir(nullptr, 0);
+}
+
+std::string QUARVOImputer_pieces::ecrirePiece(Evt* evt) {
+  // Links of the piece written since the pointing (by another job) are never added to: the
+  // piece is left as it is. Links of an earlier version of the piece go before the new ones.
+  Table dejaLies(this, "VOVOVA", "QUARVO", "DEJA_LIES");
+  dejaLies.effacerCriteres();
+  dejaLies.ajouterCritere("COMPOSANT", '=', eappr_.valeur("COMPOSANT"));
+  dejaLies.ajouterCritere("COMPOSANT_IDENT", '=', eappr_.valeur("COMPOSANT_IDENT"));
+  if (dejaLies.lire(3) == 0) {
+    if (version(dejaLies) == version(eappr_)) return "DEJA_LIEE";
+    EvtParamVal cancel{eappr_.valeur("COMPOSANT"), eappr_.valeur("COMPOSANT_IDENT")};
+    appelerModule("", "QUARVO", "QUARVO-ANNULER1", &cancel);
+  }
+  lappr_.chercher(3, "NUMERO", '/', Valeur::chaine(eappr_.valeur("IDENT").toChaine() + "|"));
+  lappr_.ouvrir();
+  while (lappr_.lire(1) == 0) {
+    std::string key =
+        lappr_.valeur("COMPOSANT").toChaine() + "|" + lappr_.valeur("COMPOSANT_IDENT").toChaine();
+    vappr_.chercher(3, "IDENT", '=', Valeur::chaine(key));
+    vappr_.ouvrir();
+    while (vappr_.lire(1) == 0) {
+      if (toDouble(vappr_.valeur("QTE")) == 0) continue;
+      if (appeler(*this, "AFAFFA", "LECTURE", {vappr_.valeur("AFAFFA_IDENT")}) != 0) continue;
+      if (appeler(*this, "AFLBUD", "LECTURE", {vappr_.valeur("AFLBUD_IDENT")}) != 0) continue;
+      if (appeler(*this, "AFPRES", "LECTURE", {iAflbud_.valeur("AFPRES_IDENT")}) != 0) continue;
+      appelerProcedure("", "", "", "SUPPRESSION_MAJ_LIENS", evt, 0);
+      appelerProcedure("", "", "", "MAJ_QUARVO", evt, 0);
+      appelerProcedure("", "", "", "MAJ_LIENS", evt, 0);
+    }
+  }
+  return "ECRITE";
 }
 
 // The withdraw and recompute around a write concern only the piece being written: the other
@@ -91,7 +124,9 @@ void QUARVOImputer_pieces::maj_quarvo(Evt* evt) {
     // holds on any database.
     quarvo_.ecrire("CLE_COMPO", Valeur::chaine(key));
     quarvo_.inserer();
+    ++liensCrees_;
   }
+  htLie_ += toMonnaie(vappr_.valeur("HT"));
   quarvo_.ecrire("QTE",
                  Valeur::dbl(toDouble(quarvo_.valeur("QTE")) + toDouble(vappr_.valeur("QTE"))));
   quarvo_.ecrire("HT",

@@ -4,6 +4,14 @@
 // write the budget line's figures are withdrawn and recomputed through the module's interface.
 // Pieces marked in error ("IMPUTATION" "N") and allocations without quantity write nothing.
 // Each piece is written whole or not at all, so an interrupted run can be run again.
+//
+// Two jobs may impute the same pieces at once: each piece is decided inside its own write
+// transaction, one writer at a time. A piece that has link rows of the version pointed (another
+// job linked it since the pointing) is left as it is, never added to; a piece whose link rows are
+// of an earlier version (it changed since it was linked) has them cancelled ("QUARVO-ANNULER1")
+// in the same transaction, before its new ones are written. Each piece's record of "M_EAPPR"
+// then says what this run did: "ECRITURE" ("ECRITE" or "DEJA_LIEE"), the link rows it created
+// ("LIENS_CREES") and the amount it linked ("HT_LIE").
 #pragma once
 
 #include "host/automate/Traitmnt.h"
@@ -21,6 +29,10 @@ class QUARVOImputer_pieces : public host::Traitmnt {
   void maj_liens(host::Evt* evt);
 
  private:
+  // Writes the links of the current piece of "M_EAPPR"; says what it did.
+  std::string ecrirePiece(host::Evt* evt);
+  int64_t liensCrees_ = 0;
+  host::Monnaie htLie_;
   host::Field& vIdent_;
   host::Table eappr_;
   host::Table lappr_;

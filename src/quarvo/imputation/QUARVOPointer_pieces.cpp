@@ -218,7 +218,9 @@ void QUARVOPointer_pieces::pointerPiece(Evt* evt, const Sorte& sorte, Table& hea
     }
   }
 
-  // Linked before: unchanged since, nothing to do; changed, the old links go first.
+  // Linked before and unchanged since: nothing to do. A piece changed since it was linked is
+  // pointed again; its old links are cancelled by the writer, in the transaction that writes the
+  // new ones, so that the pointing (and a proposal abandoned after it) changes nothing.
   quarvo2_.effacerCriteres();
   quarvo2_.ajouterCritere("COMPOSANT", '=', Valeur::chaine(sorte.entete));
   quarvo2_.ajouterCritere("COMPOSANT_IDENT", '=', Valeur::chaine(ident));
@@ -229,8 +231,6 @@ void QUARVOPointer_pieces::pointerPiece(Evt* evt, const Sorte& sorte, Table& hea
     std::string current =
         toDate(header.valeur("DATE_MAJ")).text() + header.valeur("HEURE_MAJ").toChaine();
     if (linked == current) return;
-    EvtParamVal cancel{quarvo2_.valeur("COMPOSANT"), quarvo2_.valeur("COMPOSANT_IDENT")};
-    appelerModule("", "QUARVO", "QUARVO-ANNULER1", &cancel);
   }
 
   vEtatPiece_.set("0");
