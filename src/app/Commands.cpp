@@ -3,6 +3,7 @@
 #include <unistd.h>
 
 #include <CLI/CLI.hpp>
+#include <algorithm>
 #include <deque>
 #include <fstream>
 #include <functional>
@@ -22,6 +23,7 @@
 #include "host/UException.h"
 #include "host/automate/Automate.h"
 #include "host/automate/Registry.h"
+#include "host/table/Table.h"
 #include "host/ui/TerminalDriver.h"
 
 namespace quarvo::app {
@@ -82,6 +84,9 @@ struct Commande {
   enum class Base { Aucune, Ouverte, Creee };
   CLI::App* app = nullptr;
   Base base = Base::Ouverte;
+  // Runs automata of the company: the company must exist. Setting a database up (schema, rows
+  // loaded or dumped) needs none.
+  bool societe = true;
   std::function<int(Contexte&)> executer;
 };
 
@@ -89,7 +94,7 @@ Commande initCommand(CLI::App& cli) {
   auto demo = std::make_shared<bool>(false);
   auto* app = cli.add_subcommand("init", "Create the schema (idempotent)");
   app->add_flag("--demo", *demo, "Seed the demo data set");
-  return {app, Commande::Base::Creee, [demo](Contexte& c) {
+  return {app, Commande::Base::Creee, false, [demo](Contexte& c) {
             bool seeded = *demo && c.workspace->seedDemo();
             c.out << "database " << c.options.db << " ready"
                   << (seeded ? " with the demo data" : "") << "\n";
@@ -103,7 +108,7 @@ Commande loadCommand(CLI::App& cli) {
   auto* app = cli.add_subcommand("load", "Load rows of a table from a tab-separated file");
   app->add_option("TABLE", *table, "Table name")->required();
   app->add_option("FILE", *file, "Tab-separated file with a header of column names")->required();
-  return {app, Commande::Base::Ouverte, [table, file](Contexte& c) {
+  return {app, Commande::Base::Ouverte, false, [table, file](Contexte& c) {
             std::ifstream in(*file, std::ios::binary);
             if (!in) throw UsageError("cannot read " + *file);
             size_t n = loadTsv(*c.session, *table, in, *file);
@@ -118,7 +123,7 @@ Commande dumpCommand(CLI::App& cli) {
   auto* app = cli.add_subcommand("dump", "Print the rows of a table, tab-separated");
   app->add_option("TABLE", *table, "Table name")->required();
   app->add_option("--where", *where, "COL=VALUE filter (repeatable)");
-  return {app, Commande::Base::Ouverte, [table, where](Contexte& c) {
+  return {app, Commande::Base::Ouverte, false, [table, where](Contexte& c) {
             std::vector<std::pair<std::string, std::string>> filters;
             for (const auto& w : *where) {
               auto eq = w.find('=');
@@ -134,7 +139,7 @@ Commande dumpCommand(CLI::App& cli) {
 
 Commande automataCommand(CLI::App& cli) {
   auto* app = cli.add_subcommand("automata", "List the registered automata");
-  return {app, Commande::Base::Aucune, [](Contexte& c) {
+  return {app, Commande::Base::Aucune, false, [](Contexte& c) {
             for (const auto& n : Registry::instance().names()) c.out << n << "\n";
             return 0;
           }};
@@ -149,7 +154,7 @@ Commande runCommand(CLI::App& cli) {
   app->add_option("ARGS", *params, "Positional parameters");
   app->allow_extras(false);
   app->prefix_command(false);
-  return {app, Commande::Base::Ouverte, [name, params](Contexte& c) {
+  return {app, Commande::Base::Ouverte, true, [name, params](Contexte& c) {
             CallerFields caller(*params);
             EvtParamRef evt(caller.args);
             AutomatePtr automate = c.session->creer(*name, &evt);
@@ -173,7 +178,7 @@ Commande callCommand(CLI::App& cli) {
   app->add_option("LABEL", *label, "Procedure label")->required();
   app->add_option("ARGS", *params, "Positional parameters");
   app->allow_extras(false);
-  return {app, Commande::Base::Ouverte, [module, label, params](Contexte& c) {
+  return {app, Commande::Base::Ouverte, true, [module, label, params](Contexte& c) {
             if (!Registry::instance().find(*module + "-INTERFACE")) {
               throw UsageError("unknown module " + *module);
             }
@@ -195,7 +200,7 @@ Commande pieceCommand(CLI::App& cli, const char* name, const char* description,
   auto* app = cli.add_subcommand(name, description);
   app->add_option("KIND", *kind, "Piece kind: GAPECOM, GAPEBL, GAPEFAC or CF, BF, FF")->required();
   app->add_option("IDENT", *ident, "Identifier or document number of the piece")->required();
-  return {app, Commande::Base::Ouverte,
+  return {app, Commande::Base::Ouverte, true,
           [kind, ident, action](Contexte& c) { return action(*c.session, *kind, *ident, c.out); }};
 }
 
@@ -203,7 +208,7 @@ Commande recomputeCommand(CLI::App& cli) {
   auto line = std::make_shared<std::string>();
   auto* app = cli.add_subcommand("recompute", "Recompute a budget line's figures from its links");
   app->add_option("LINE", *line, "Budget line identifier")->required();
-  return {app, Commande::Base::Ouverte,
+  return {app, Commande::Base::Ouverte, true,
           [line](Contexte& c) { return runRecompute(*c.session, *line, c.out); }};
 }
 
@@ -216,7 +221,7 @@ Commande checkCommand(CLI::App& cli) {
       "some differ)");
   app->add_option("--line", *line, "Only this budget line");
   app->add_flag("--fix", *fix, "Bring the differing lines in line, in one transaction");
-  return {app, Commande::Base::Ouverte,
+  return {app, Commande::Base::Ouverte, true,
           [line, fix](Contexte& c) { return runCheck(*c.session, *line, *fix, c.out); }};
 }
 
@@ -234,14 +239,14 @@ Commande imputeCommand(CLI::App& cli) {
   app->add_flag("--arbitration", o->arbitration,
                 "First suitable budget line wins; a missing one is created");
   app->add_flag("--dry-run", o->dryRun, "Point only and print the proposal");
-  return {app, Commande::Base::Ouverte,
+  return {app, Commande::Base::Ouverte, true,
           [o](Contexte& c) { return runImpute(*c.session, *o, c.out); }};
 }
 
 Commande importCommand(CLI::App& cli) {
   auto o = std::make_shared<ImportOptions>();
   auto* app = addImportCommand(cli, *o);
-  return {app, Commande::Base::Ouverte,
+  return {app, Commande::Base::Ouverte, true,
           [o](Contexte& c) { return runImport(*c.session, *o, c.out); }};
 }
 
@@ -273,7 +278,7 @@ Commande reportCommand(CLI::App& cli) {
   s->exporter = app->add_option("--export", s->exportFile,
                                 "Export file; .xlsx gives a workbook (default: the saved one)")
                     ->expected(0, 1);
-  return {app, Commande::Base::Ouverte, [s](Contexte& c) {
+  return {app, Commande::Base::Ouverte, true, [s](Contexte& c) {
             ReportOptions options = s->options;
             options.beforePeriod = !s->noBefore;
             if (*s->print) options.print = s->pdf;
@@ -291,7 +296,7 @@ Commande genCommand(CLI::App& cli) {
   app->add_option("--lines", o->lines, "Lines per order")->capture_default_str();
   app->add_option("--services", o->services, "Services, one budget line each per budget")
       ->capture_default_str();
-  return {app, Commande::Base::Ouverte,
+  return {app, Commande::Base::Ouverte, true,
           [o](Contexte& c) { return runGenerate(*c.session, *o, c.out); }};
 }
 
@@ -299,7 +304,8 @@ Commande demoCommand(CLI::App& cli) {
   auto dir = std::make_shared<std::string>("quarvo-demo");
   auto* app = cli.add_subcommand("demo", "Build a demo database and show what QUARVO does");
   app->add_option("--dir", *dir, "Folder to create afresh")->capture_default_str();
-  return {app, Commande::Base::Aucune, [dir](Contexte& c) { return runDemo(*dir, c.out, c.err); }};
+  return {app, Commande::Base::Aucune, false,
+          [dir](Contexte& c) { return runDemo(*dir, c.out, c.err); }};
 }
 
 // Runs the parsed subcommand: opens (or creates) the database and the session it needs.
@@ -312,6 +318,13 @@ int executer(const Commande& commande, const Options& o, std::ostream& out, std:
       commande.base == Commande::Base::Creee ? Workspace::init(o.db) : Workspace::open(o.db);
   Session& session = ws->startSession(ui, o.company, o.user);
   Session::Scope scope(session);
+  if (commande.societe) {
+    Table societes(nullptr, "VOVOVA", "AFSOCI", "SOCIETE");
+    if (societes.chercher(3, "CODE", '=', Valeur::chaine(o.company)) != 0) {
+      throw UsageError("unknown company '" + o.company + "' (--company): no company of " + o.db +
+                       " has that code");
+    }
+  }
   contexte.workspace = ws.get();
   contexte.session = &session;
   return commande.executer(contexte);
@@ -349,6 +362,23 @@ int runCommandLine(int argc, char** argv, std::ostream& out, std::ostream& err) 
       genCommand(cli),
       demoCommand(cli),
   };
+
+  // A word where the command is expected that names no command is named back.
+  for (int i = 1; i < argc; ++i) {
+    std::string word = argv[i];
+    if (word == "--db" || word == "--company" || word == "--user" || word == "--answer") {
+      ++i;
+      continue;
+    }
+    if (word.rfind("-", 0) == 0) continue;
+    auto all = cli.get_subcommands([](CLI::App*) { return true; });
+    if (std::none_of(all.begin(), all.end(),
+                     [&word](const CLI::App* sub) { return sub->get_name() == word; })) {
+      err << "quarvo: unknown command '" << word << "' (see quarvo --help)\n";
+      return 2;
+    }
+    break;
+  }
 
   try {
     cli.parse(argc, argv);

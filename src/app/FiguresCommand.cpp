@@ -1,5 +1,10 @@
 #include "app/FiguresCommand.h"
 
+#include <fmt/format.h>
+
+#include <cmath>
+#include <cstdint>
+#include <map>
 #include <ostream>
 #include <vector>
 
@@ -8,6 +13,7 @@
 #include "host/automate/Automate.h"
 #include "host/table/Champ.h"
 #include "host/table/Database.h"
+#include "quarvo/frame/Apports.h"
 
 namespace quarvo::app {
 
@@ -81,6 +87,79 @@ std::vector<std::string> lines(const std::optional<std::string>& only) {
   return all;
 }
 
+// The link rows of one piece, added up, against the piece itself.
+struct PieceLiee {
+  std::string table;
+  std::string ident;
+  std::string numero;
+  double qte = 0;
+  Monnaie ht;
+};
+
+// What the piece's lines hold: quantities and net amounts, by absolute value, whatever was
+// settled since. nullopt when the piece does not exist.
+std::optional<std::pair<double, Monnaie>> contenuPiece(Session& s, const std::string& table,
+                                                       const std::string& ident) {
+  if (s.db().store(table) == nullptr) return std::nullopt;
+  Table entete(nullptr, table == "AFEFFO" ? "VOVOVA" : "GESCOM", table, "AUDIT_PIECE");
+  if (entete.chercher(3, "IDENT", '=', Valeur::chaine(ident)) != 0) return std::nullopt;
+  std::string tableLignes = "GAPL" + table.substr(std::min<size_t>(4, table.size()));
+  if (table == "AFEFFO" || s.db().store(tableLignes) == nullptr) {
+    return std::pair<double, Monnaie>{1e300, Monnaie::fromMicros(INT64_MAX)};  // no bound known
+  }
+  auto colonneEntete = [&entete](const std::string& c) { return entete.valeur(c); };
+  frame::EnteteAchat e = frame::enteteAchat(table, colonneEntete);
+  Table lignes(nullptr, "GESCOM", tableLignes, "AUDIT_LIGNES");
+  lignes.chercher(3, "NUMERO", '/', Valeur::chaine(ident + "|"));
+  lignes.ouvrir();
+  auto colonneLigne = [&lignes](const std::string& c) { return lignes.valeur(c); };
+  double qte = 0;
+  Monnaie ht;
+  while (lignes.lire(1) == 0) {
+    frame::LigneAchat l = frame::ligneAchat(colonneLigne);
+    l.qteSoldee = 0;
+    frame::ApportLigne a = frame::apportLigne(e, l);
+    qte += std::abs(a.qte);
+    ht += a.ht.abs();
+  }
+  return std::pair<double, Monnaie>{qte, ht};
+}
+
+// Link rows that name no piece, and pieces linked beyond what they hold.
+std::vector<TextRow> liensSansPiece(Session& s) {
+  std::map<std::pair<std::string, std::string>, PieceLiee> pieces;
+  Table liens(nullptr, "VOVOVA", "QUARVO", "AUDIT_LIENS");
+  liens.ouvrir();
+  while (liens.lire(1) == 0) {
+    std::string table = liens.valeur("COMPOSANT").toChaine();
+    std::string ident = liens.valeur("COMPOSANT_IDENT").toChaine();
+    PieceLiee& p = pieces[{table, ident}];
+    p.table = table;
+    p.ident = ident;
+    p.numero = liens.valeur("PIECE").toChaine();
+    p.qte += std::abs(toDouble(liens.valeur("QTE")));
+    p.ht += toMonnaie(liens.valeur("HT")).abs();
+  }
+  std::vector<TextRow> rows;
+  for (const auto& [key, p] : pieces) {
+    auto contenu = contenuPiece(s, p.table, p.ident);
+    std::string piece = p.table + " " + p.ident + " (" + p.numero + ")";
+    if (!contenu) {
+      rows.push_back({piece, "linked, but the piece does not exist", "", ""});
+      continue;
+    }
+    const auto& [qte, ht] = *contenu;
+    if (p.qte > qte + 1e-9) {
+      rows.push_back({piece, "quantity linked beyond the piece's", fmt::format("{}", p.qte),
+                      fmt::format("{}", qte)});
+    }
+    if (p.ht > ht) {
+      rows.push_back({piece, "amount linked beyond the piece's", p.ht.text(), ht.text()});
+    }
+  }
+  return rows;
+}
+
 }  // namespace
 
 int runCheck(Session& s, const std::optional<std::string>& only, bool fix, std::ostream& out) {
@@ -98,13 +177,17 @@ int runCheck(Session& s, const std::optional<std::string>& only, bool fix, std::
                       (figure(stored, i) - figure(extra, i)).text(), figure(extra, i).text()});
     }
   }
-  if (drifting.empty()) {
+  // The links against their pieces, for the whole database (a link may be wrong on any line).
+  std::vector<TextRow> pieces = only ? std::vector<TextRow>{} : liensSansPiece(s);
+  if (drifting.empty() && pieces.empty()) {
     out << "Every budget line checked matches its links.\n";
     return 0;
   }
-  out << drifting.size() << " budget line(s) differ from their links:\n";
-  printTable(out, {"Line", "Figure", "Stored", "Recomputed", "Difference"}, rows);
-  if (fix) {
+  if (!drifting.empty()) {
+    out << drifting.size() << " budget line(s) differ from their links:\n";
+    printTable(out, {"Line", "Figure", "Stored", "Recomputed", "Difference"}, rows);
+  }
+  if (fix && !drifting.empty()) {
     // One transaction for the whole fix: either every line is brought in line or none.
     Transaction tx(s.db());
     for (const auto& line : drifting) recompute(s, line);
@@ -112,6 +195,14 @@ int runCheck(Session& s, const std::optional<std::string>& only, bool fix, std::
     out << "Fixed: ";
     for (size_t i = 0; i < drifting.size(); ++i) out << (i ? ", " : "") << drifting[i];
     out << " now match their links.\n";
+  }
+  if (!pieces.empty()) {
+    out << "Links that do not match their pieces"
+        << (fix ? " (left as they are: which link is "
+                  "right is for a person to say)"
+                : "")
+        << ":\n";
+    printTable(out, {"Piece", "Problem", "Linked", "Piece holds"}, pieces);
   }
   return 1;
 }

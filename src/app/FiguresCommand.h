@@ -6,6 +6,12 @@
 // line's links are withdrawn ("SUPPRESSION_MAJ"); what the line still holds afterwards is the
 // drift, the part of its figures that no link explains. A fix withdraws the links, clears that
 // drift and adds the links back ("VALIDATION_MAJ"), all in one transaction.
+//
+// The audit also checks the links against their pieces: every link row names a piece that
+// exists, and the link rows of one piece, over all budget lines, never hold more quantity nor
+// more amount than the piece itself (its lines' quantities and net amounts by the rule every
+// linking path shares, credit notes by absolute value). A fix cannot know which of such links is
+// right: it lists them, leaves them, and the audit exits 1.
 #pragma once
 
 #include <iosfwd>
@@ -17,8 +23,8 @@
 namespace quarvo::app {
 
 // Prints the lines whose stored figures differ from their links (stored, recomputed,
-// difference); with `fix`, brings them in line and says what changed. Returns 0 when nothing
-// differed, 1 when something did.
+// difference) and the pieces their links do not match; with `fix`, brings the figures in line and
+// says what changed. Returns 0 when nothing differed, 1 when something did.
 int runCheck(host::Session& session, const std::optional<std::string>& line, bool fix,
              std::ostream& out);
 // Recomputes one budget line from its links; prints its figures before and after.

@@ -113,6 +113,17 @@ TEST_F(CliTest, RunPrintsResultsAndOutcome) {
   EXPECT_EQ(quarvo("run QUARVO-NOTHING").code, 2);
   EXPECT_EQ(quarvo("call NOMODULE LECTURE 1").code, 2);
   EXPECT_NE(quarvo("automata").out.find("QUARVO-EXISTE_CHAINAGE_AVAL\n"), std::string::npos);
+  // A word that names no command is named back; a company that does not exist is refused by
+  // every command that runs its automata, not by those that set a database up.
+  Result unknown = quarvo("frobnicate");
+  EXPECT_EQ(unknown.code, 2);
+  EXPECT_NE(unknown.out.find("unknown command 'frobnicate'"), std::string::npos) << unknown.out;
+  for (const char* command : {"import --cf x.txt", "impute", "check", "run QUARVO-ANALYSER"}) {
+    Result nope = quarvo(std::string("--company NOPE ") + command);
+    EXPECT_EQ(nope.code, 2) << command;
+    EXPECT_NE(nope.out.find("unknown company 'NOPE'"), std::string::npos) << nope.out;
+  }
+  EXPECT_EQ(quarvo("--company NOPE dump AFSOCI").code, 0);
 
   // A dialog's answer is a button's number, whole, or its text; anything else refuses (the
   // last button), as when no answer is left.
@@ -154,6 +165,31 @@ TEST_F(CliTest, CheckFindsAPlantedDriftAndFixRemovesIt) {
       << cancelled.out;
   EXPECT_EQ(quarvo("check").code, 0);
   EXPECT_EQ(quarvo("cancel XX 1").code, 2);
+
+  // A piece linked twice (its link copied onto another line, whose figures agree with it) and a
+  // link to a piece that does not exist: the figures match, the links do not; --fix leaves them.
+  ASSERT_EQ(quarvo("impute").code, 0);
+  std::string doubled =
+      "sqlite3 " + db_ +
+      " \"INSERT INTO QUARVO (IDENT, AFEBUD_IDENT, AFAFFA_IDENT, AFLBUD_IDENT, COMPOSANT, "
+      "COMPOSANT_IDENT, PIECE, DATE_PIECE, QTE, HT) SELECT '0000005002', AFEBUD_IDENT, "
+      "AFAFFA_IDENT, '0000000212', COMPOSANT, COMPOSANT_IDENT, PIECE, DATE_PIECE, QTE, HT FROM "
+      "QUARVO WHERE PIECE = 'CF26000002' LIMIT 1; INSERT INTO QUARVO (IDENT, AFEBUD_IDENT, "
+      "AFAFFA_IDENT, AFLBUD_IDENT, COMPOSANT, COMPOSANT_IDENT, PIECE, DATE_PIECE, QTE, HT) VALUES "
+      "('0000005003', '0000000201', '0000000011', '0000000212', 'GAPEFAC', '0000009999', "
+      "'FF29999999', '2026-03-02', 1, '10.00')\"";
+  ASSERT_EQ(system(doubled.c_str()), 0);
+  ASSERT_EQ(quarvo("recompute 0000000212").code, 0);
+  Result links = quarvo("check --fix");
+  EXPECT_EQ(links.code, 1);
+  EXPECT_EQ(links.out.find("differ from their links"), std::string::npos) << links.out;
+  EXPECT_NE(links.out.find("GAPECOM 0000000402 (CF26000002)  amount linked beyond the piece's"),
+            std::string::npos)
+      << links.out;
+  EXPECT_NE(links.out.find("GAPEFAC 0000009999 (FF29999999)  linked, but the piece does not exist"),
+            std::string::npos)
+      << links.out;
+  EXPECT_EQ(quarvo("check").code, 1);  // left as they were
 }
 
 }  // namespace
