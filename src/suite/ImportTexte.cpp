@@ -178,6 +178,13 @@ std::string apercu(const std::string& value) {
   return host::apercu(value, 40);
 }
 
+// The columns without which a piece cannot be generated: its number, date and supplier, and
+// each line's article, quantity and price. Only the purchase staging tables have any.
+std::vector<const char*> colonnesRequises(const std::string& table) {
+  if (table.rfind("IMM_PIECE_", 0) != 0) return {"NUMERO_DOC"};
+  return {"NUMERO_DOC", "DATE_CREATION", "FOURNISSEUR", "ARTICLE", "QTE", "PUHT"};
+}
+
 std::string attendu(ColKind kind) {
   switch (kind) {
     case ColKind::Date:
@@ -275,23 +282,38 @@ ResultatChargement ImportTexte::charger(Session& session, const std::string& tab
   std::vector<size_t> colonnes;
   std::set<std::string> vues;
   size_t colPiece = SIZE_MAX;
+  // The header's faults are bounded like the lines': past kErreursMax, they are only counted.
+  size_t fautesEntete = 0;
+  auto fauteEntete = [&](ErreurChargement e) {
+    if (fautesEntete++ < kErreursMax) r.erreurs.push_back(std::move(e));
+  };
   for (const auto& raw : cells) {
     std::string name = majuscules(raw);
     auto i = schema.index(name);
     if (!i || name == "IDENT" || name == "LIGNE_FICHIER") {
-      r.erreurs.push_back({1, name, "", "colonne inconnue de la table " + table, ""});
+      fauteEntete({1, apercu(name), "", "colonne inconnue de la table " + table, ""});
       continue;
     }
     if (!vues.insert(name).second) {
-      r.erreurs.push_back({1, name, "", "colonne nommée deux fois", ""});
+      fauteEntete({1, name, "", "colonne nommée deux fois", ""});
       continue;
     }
     if (name == "NUMERO_DOC") colPiece = colonnes.size();
     colonnes.push_back(*i);
   }
-  if (r.erreurs.empty() && colPiece == SIZE_MAX) {
-    r.erreurs.push_back(
-        {1, "NUMERO_DOC", "", "colonne absente : la première ligne doit nommer les colonnes", ""});
+  if (fautesEntete > kErreursMax) {
+    r.erreurs.push_back({1, "", "",
+                         "et " + std::to_string(fautesEntete - kErreursMax) +
+                             " autres colonnes refusées : la lecture s'arrête",
+                         ""});
+  }
+  if (r.erreurs.empty()) {
+    for (const char* requise : colonnesRequises(table)) {
+      if (vues.count(requise) == 0) {
+        r.erreurs.push_back(
+            {1, requise, "", "colonne absente : la première ligne doit la nommer", ""});
+      }
+    }
   }
   if (!r.erreurs.empty()) {
     ecrireErreurs(session, table, fichier, r.erreurs);

@@ -4,7 +4,10 @@
 // Rule: a file of format "EXCEL1" is tab-separated text, read by the exchange format's rule
 // (host/TexteTabule.h: quoted cells may hold tabs and line breaks; blanks around cells are not
 // part of them). Its first record names staging columns (any order, names compared in upper
-// case; "NUMERO_DOC" is required, "IDENT" and "LIGNE_FICHIER" are the loader's own); each
+// case; "IDENT" and "LIGNE_FICHIER" are the loader's own). "NUMERO_DOC" is required, and a file
+// of purchase pieces ("IMM_PIECE_...") must also name what a piece cannot be generated without:
+// "DATE_CREATION", "FOURNISSEUR", "ARTICLE", "QTE" and "PUHT" (a missing one refuses the file,
+// naming it; a file without "QTE" would otherwise import every quantity as 0). Each
 // further record is one row, numbered by the line it starts on. Lines end in LF or CRLF; each
 // line is read as UTF-8 when it is valid UTF-8 and as Windows-1252 otherwise; a leading
 // byte-order mark is dropped; blank lines are skipped. Dates are "dd/mm/yyyy" (ISO is read too),

@@ -24,8 +24,8 @@ TEST(ImportTexteTest, LoadsCrlfWindows1252AnyColumnOrderAndReplacesTheStagedFile
   // Windows-1252 "é" is 0xE9; a byte-order mark on an otherwise UTF-8 line is dropped.
   std::string file =
       "\xEF\xBB\xBF"
-      "DESIG\tnumero_doc\tQTE\tPUHT\tDATE_CREATION\tSOLDE\r\n"
-      "Tube \"PER\"\tC1\t2,5\t1 0\t01/12/2026\t1\r\n";
+      "DESIG\tnumero_doc\tQTE\tPUHT\tDATE_CREATION\tSOLDE\tFOURNISSEUR\tARTICLE\r\n"
+      "Tube \"PER\"\tC1\t2,5\t1 0\t01/12/2026\t1\tS\tA\r\n";
   auto bad = ecrireFichier(t, "cf.txt", file);
   EXPECT_EQ(charger(t, "IMM_PIECE_CF", bad.string()), 1);  // "1 0" is no number
   EXPECT_EQ(requete(t, R"(SELECT NUMERO_DOC FROM "IMM_PIECE_CF")"), "ANCIEN\n");
@@ -34,13 +34,13 @@ TEST(ImportTexteTest, LoadsCrlfWindows1252AnyColumnOrderAndReplacesTheStagedFile
             "nombre attendu (virgule ou point décimal)\n");
 
   file =
-      "DESIG\tnumero_doc\tQTE\tPUHT\tDATE_CREATION\tSOLDE\r\n"
-      "Coude \xE9quip\xE9\tC1\t2,5\t180.50\t01/12/2026\t1\r\n"
+      "DESIG\tnumero_doc\tQTE\tPUHT\tDATE_CREATION\tSOLDE\tFOURNISSEUR\tARTICLE\r\n"
+      "Coude \xE9quip\xE9\tC1\t2,5\t180.50\t01/12/2026\t1\tS\tA\r\n"
       "\r\n"
-      "\"Tube \"\"PER\"\"\"\tC2\t3\t 12,125 \t2026-11-30\t0\n"
+      "\"Tube \"\"PER\"\"\"\tC2\t3\t 12,125 \t2026-11-30\t0\tS\tA\n"
       // A quoted designation may hold a tab and a line break; rows keep the line they start on.
-      "\"Coude\tdouble\r\nsur deux lignes\"\tC3\t1\t1\t01/12/2026\t0\r\n"
-      "Manchon\tC4\t1\t2\t01/12/2026\t0\n";
+      "\"Coude\tdouble\r\nsur deux lignes\"\tC3\t1\t1\t01/12/2026\t0\tS\tA\r\n"
+      "Manchon\tC4\t1\t2\t01/12/2026\t0\tS\tA\n";
   auto good = ecrireFichier(t, "cf2.TXT", file);
   EXPECT_EQ(charger(t, "IMM_PIECE_CF", good.string()), 0);
   EXPECT_EQ(requete(t, R"(SELECT IDENT, NUMERO_DOC, DESIG, QTE, PUHT, DATE_CREATION, SOLDE,
@@ -56,11 +56,11 @@ TEST(ImportTexteTest, EveryFaultNamesFileLineColumnAndValueAndStagesNothing) {
   t.sql(R"(INSERT INTO "IMM_PIECE_FF" ("NUMERO_DOC") VALUES ('GARDE');
            INSERT INTO "IMM_ERREUR" ("IDENT") VALUES ('0000000041'))");
   std::string file =
-      "NUMERO_DOC\tDATE_CREATION\tQTE\tVALIDE\n"
-      "F1\t31/02/2026\t1\t1\n"     // impossible date
-      "F2\t01/12/2026\tdeux\t1\n"  // number with letters
-      "F3\t01/12/2026\t1\n"        // a value missing
-      "F4\t01/12/26\t1\t1,5\n";    // two-digit year, decimal integer
+      "NUMERO_DOC\tDATE_CREATION\tQTE\tVALIDE\tFOURNISSEUR\tARTICLE\tPUHT\n"
+      "F1\t31/02/2026\t1\t1\tS\tA\t1\n"     // impossible date
+      "F2\t01/12/2026\tdeux\t1\tS\tA\t1\n"  // number with letters
+      "F3\t01/12/2026\t1\tS\tA\t1\n"        // a value missing
+      "F4\t01/12/26\t1\t1,5\tS\tA\t1\n";    // two-digit year, decimal integer
   auto path = ecrireFichier(t, "ff.txt", file);
   EXPECT_EQ(charger(t, "IMM_PIECE_FF", path.string()), 1);
   EXPECT_EQ(requete(t, R"(SELECT CODE, DESIG, CMT FROM "IMM_ERREUR" WHERE IDENT > '0000000041')"),
@@ -68,7 +68,7 @@ TEST(ImportTexteTest, EveryFaultNamesFileLineColumnAndValueAndStagesNothing) {
             "jj/mm/aaaa attendue\n"
             "F2|Fichier ff.txt, ligne 3|colonne QTE, valeur \"deux\" : nombre attendu (virgule ou "
             "point décimal)\n"
-            "F3|Fichier ff.txt, ligne 4|3 valeurs pour 4 colonnes\n"
+            "F3|Fichier ff.txt, ligne 4|6 valeurs pour 7 colonnes\n"
             "F4|Fichier ff.txt, ligne 5|colonne DATE_CREATION, valeur \"01/12/26\" : date "
             "jj/mm/aaaa attendue\n"
             "F4|Fichier ff.txt, ligne 5|colonne VALIDE, valeur \"1,5\" : nombre entier attendu\n");
@@ -78,11 +78,18 @@ TEST(ImportTexteTest, EveryFaultNamesFileLineColumnAndValueAndStagesNothing) {
   auto header = ecrireFichier(t, "entete.txt", "F1\t01/12/2026\nF2\t02/12/2026\n");
   auto unknown = ecrireFichier(t, "inconnu.txt", "NUMERO_DOC\tPRIX\tNUMERO_DOC\n");
   auto empty = ecrireFichier(t, "vide.txt", "");
-  auto binary = ecrireFichier(t, "image.txt", std::string("NUMERO_DOC\nGIF89a\0\x01\x02", 20));
+  auto binary = ecrireFichier(t, "image.txt",
+                              "NUMERO_DOC\tDATE_CREATION\tFOURNISSEUR\tARTICLE\tQTE\tPUHT\nGIF89a" +
+                                  std::string("\0\x01\x02", 3));
+  // Without a column a piece cannot be generated without, the file is refused, naming it.
+  auto sansQte = ecrireFichier(t, "sansqte.txt",
+                               "NUMERO_DOC\tDATE_CREATION\tFOURNISSEUR\tARTICLE\tPUHT\n"
+                               "F1\t01/12/2026\tS\tA\t1\n");
   EXPECT_EQ(charger(t, "IMM_PIECE_FF", header.string()), 1);
   EXPECT_EQ(charger(t, "IMM_PIECE_FF", unknown.string()), 1);
   EXPECT_EQ(charger(t, "IMM_PIECE_FF", empty.string()), 1);
   EXPECT_EQ(charger(t, "IMM_PIECE_FF", binary.string()), 1);
+  EXPECT_EQ(charger(t, "IMM_PIECE_FF", sansQte.string()), 1);
   EXPECT_EQ(charger(t, "IMM_PIECE_FF", (t.dir() / "absent.txt").string()), 1);
   EXPECT_EQ(charger(t, "QUARVO", header.string()), 1);  // only import tables are loaded
   std::string all = requete(t, R"(SELECT DESIG, CMT FROM "IMM_ERREUR" ORDER BY IDENT)");
@@ -98,6 +105,8 @@ TEST(ImportTexteTest, EveryFaultNamesFileLineColumnAndValueAndStagesNothing) {
             "Fichier vide.txt|fichier vide : la première ligne doit nommer les colonnes\n"
             "Fichier image.txt, ligne 2|contenu binaire (caractère de contrôle 0) : ce n'est pas "
             "un fichier texte\n"
+            "Fichier sansqte.txt, ligne 1|colonne QTE, valeur \"\" : colonne absente : la première "
+            "ligne doit la nommer\n"
             "Fichier absent.txt|valeur \"" +
                 (t.dir() / "absent.txt").string() +
                 "\" : fichier introuvable\n"
@@ -107,27 +116,36 @@ TEST(ImportTexteTest, EveryFaultNamesFileLineColumnAndValueAndStagesNothing) {
 
 TEST(ImportTexteTest, LongLinesAreRefusedAndBigFilesStream) {
   test::TestSession t;
-  std::string file = "NUMERO_DOC\tDESIG\nF1\t" + std::string(70 * 1024, 'x') + "\nF2\tok\n";
+  const std::string colonnes = "\tDATE_CREATION\tFOURNISSEUR\tARTICLE\tPUHT\n";
+  const std::string valeurs = "\t01/12/2026\tS\tA\t1\n";
+  std::string file = "NUMERO_DOC\tDESIG\tQTE" + colonnes + "F1\t" + std::string(70 * 1024, 'x') +
+                     "\t1" + valeurs + "F2\tok\t1" + valeurs;
   auto path = ecrireFichier(t, "long.txt", file);
   EXPECT_EQ(charger(t, "IMM_PIECE_DF", path.string()), 1);
   EXPECT_EQ(requete(t, R"(SELECT CMT FROM "IMM_ERREUR")"), "ligne de plus de 65536 caractères\n");
 
   std::ostringstream big;
-  big << "NUMERO_DOC\tQTE\n";
-  for (int i = 0; i < 20000; ++i) big << "D" << i / 3 << "\t" << i << ",5\n";
+  big << "NUMERO_DOC\tQTE" << colonnes;
+  for (int i = 0; i < 20000; ++i) big << "D" << i / 3 << "\t" << i << ",5" << valeurs;
   auto bigPath = ecrireFichier(t, "gros.txt", big.str());
   EXPECT_EQ(charger(t, "IMM_PIECE_DF", bigPath.string()), 0);
   EXPECT_EQ(requete(t, R"(SELECT COUNT(*), SUM(QTE) FROM "IMM_PIECE_DF")"), "20000|200000000.0\n");
 
   // A file full of faults stops after a bounded number of them.
   std::ostringstream faulty;
-  faulty << "NUMERO_DOC\tQTE\n";
-  for (int i = 0; i < 5000; ++i) faulty << "D\tx\n";
+  faulty << "NUMERO_DOC\tQTE" << colonnes;
+  for (int i = 0; i < 5000; ++i) faulty << "D\tx" << valeurs;
   auto faultyPath = ecrireFichier(t, "faux.txt", faulty.str());
   t.sql(R"(DELETE FROM "IMM_ERREUR")");
   EXPECT_EQ(charger(t, "IMM_PIECE_DF", faultyPath.string()), 1);
   EXPECT_EQ(requete(t, R"(SELECT COUNT(*) FROM "IMM_ERREUR")"), "100\n");
   EXPECT_EQ(requete(t, R"(SELECT COUNT(*) FROM "IMM_PIECE_DF")"), "20000\n");
+
+  // So does a header of 65,000 empty names: 100 faults and their count, not 65,000 rows.
+  auto wide = ecrireFichier(t, "large.txt", "NUMERO_DOC" + std::string(65000, '\t') + "\n");
+  t.sql(R"(DELETE FROM "IMM_ERREUR")");
+  EXPECT_EQ(charger(t, "IMM_PIECE_DF", wide.string()), 1);
+  EXPECT_EQ(requete(t, R"(SELECT COUNT(*) FROM "IMM_ERREUR")"), "101\n");
 }
 
 TEST(ImportTexteTest, ErrorListIsShownAndSavedOrAppended) {
