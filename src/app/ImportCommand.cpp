@@ -101,7 +101,7 @@ int runImport(Session& session, const ImportOptions& o, std::ostream& out) {
     window->sortir();
     return 1;
   }
-  int64_t errors = 0;
+  int64_t errors = window->outcome() != 0 ? 1 : 0;
   for (const char* field : {"V_ERREUR_DF", "V_ERREUR_CF", "V_ERREUR_BF", "V_ERREUR_FF"}) {
     errors += window->champ(field)->entier();
   }

@@ -4,6 +4,7 @@
 
 #include "app/Console.h"
 #include "app/Workspace.h"
+#include "host/UException.h"
 #include "host/automate/Automate.h"
 #include "host/table/Database.h"
 #include "host/table/Table.h"
@@ -93,9 +94,35 @@ void printProposal(std::ostream& out) {
   }
 }
 
+int imputer(Session& s, const ImputeOptions& o, std::ostream& out);
+
+// The pieces the writer had to write and did not: the database refused it.
+int64_t nonEcrites() {
+  Table pieces(nullptr, "VOVOVA", "M_EAPPR", "RESUME");
+  pieces.ouvrir();
+  int64_t n = 0;
+  while (pieces.lire(1) == 0) {
+    if (pieces.valeur("IMPUTATION").toChaine() == "O" &&
+        pieces.valeur("ECRITURE").toChaine().empty())
+      ++n;
+  }
+  return n;
+}
+
 }  // namespace
 
 int runImpute(Session& s, const ImputeOptions& o, std::ostream& out) {
+  try {
+    return imputer(s, o, out);
+  } catch (const BaseIndisponible&) {
+    out << "Pieces not written: " << nonEcrites() << "\n";
+    throw;
+  }
+}
+
+namespace {
+
+int imputer(Session& s, const ImputeOptions& o, std::ostream& out) {
   Session::Scope scope(s);
   if (!o.selection()) {
     if (s.appelerModule("QUARVO-IMPUTER_AUTO", nullptr) != 0) {
@@ -145,5 +172,7 @@ int runImpute(Session& s, const ImputeOptions& o, std::ostream& out) {
   }
   return 0;
 }
+
+}  // namespace
 
 }  // namespace quarvo::app

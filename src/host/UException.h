@@ -24,4 +24,12 @@ class ConstraintError : public UException {
   using UException::UException;
 };
 
+// The database cannot be written at all: locked by another program past the wait, read-only,
+// full, or failing. No handler can go on without it: the guard lets this fault through, every
+// transaction open rolls back on the way out, and the command ends with this one line (exit 2).
+class BaseIndisponible : public UException {
+ public:
+  using UException::UException;
+};
+
 }  // namespace quarvo::host

@@ -185,6 +185,16 @@ std::vector<const char*> colonnesRequises(const std::string& table) {
   return {"NUMERO_DOC", "DATE_CREATION", "FOURNISSEUR", "ARTICLE", "QTE", "PUHT"};
 }
 
+// A purchase line's amount must be an amount: QTE × PUHT within the money type's range.
+bool montantRepresentable(Table& ligne) {
+  try {
+    (void)(toMonnaie(ligne.valeur("PUHT")) * Monnaie::fromDouble(toDouble(ligne.valeur("QTE"))));
+    return true;
+  } catch (const std::exception&) {
+    return false;
+  }
+}
+
 std::string attendu(ColKind kind) {
   switch (kind) {
     case ColKind::Date:
@@ -282,6 +292,8 @@ ResultatChargement ImportTexte::charger(Session& session, const std::string& tab
   std::vector<size_t> colonnes;
   std::set<std::string> vues;
   size_t colPiece = SIZE_MAX;
+  size_t colPrix = SIZE_MAX;
+  const bool achat = table.rfind("IMM_PIECE_", 0) == 0;
   // The header's faults are bounded like the lines': past kErreursMax, they are only counted.
   size_t fautesEntete = 0;
   auto fauteEntete = [&](ErreurChargement e) {
@@ -299,6 +311,7 @@ ResultatChargement ImportTexte::charger(Session& session, const std::string& tab
       continue;
     }
     if (name == "NUMERO_DOC") colPiece = colonnes.size();
+    if (name == "PUHT") colPrix = colonnes.size();
     colonnes.push_back(*i);
   }
   if (fautesEntete > kErreursMax) {
@@ -352,6 +365,11 @@ ResultatChargement ImportTexte::charger(Session& session, const std::string& tab
           saine = false;
         }
       }
+      if (saine && achat && !montantRepresentable(staging)) {
+        std::string prix = colPrix < cells.size() ? cells[colPrix] : std::string();
+        noter({no, "PUHT", prix, "montant de la ligne (QTE × PUHT) hors limites", piece});
+        saine = false;
+      }
       staging.ecrire("LIGNE_FICHIER", Valeur::entier(static_cast<int64_t>(no)));
       // Numbered here in file order (the table was just emptied), rather than by the table's
       // trigger, which would write every row a second time.
@@ -384,6 +402,9 @@ ResultatChargement ImportTexte::charger(Session& session, const std::string& tab
 void ImportTexte::chargerTxt(Automate& commun, Evt* evt) {
   Field& flag = commun.entier("P_ERREUR_CHARGEMENT");
   evt->param(3, flag, 1);
+  // A load that does not finish (the database refused it) is no load: the caller's flag says
+  // so until the load has said otherwise.
+  flag.set(int64_t{1});
   std::string table = evt->valeur(0).toChaine();
   std::string path = evt->valeur(1).toChaine();
   ResultatChargement r = charger(commun.session(), table, fs::path(path));

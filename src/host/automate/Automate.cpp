@@ -147,9 +147,7 @@ bool Automate::raise(const std::string& label, Evt* evt) {
     evt->setErreur(0);
   }
   rejected_ = false;
-  try {
-    handler(evt);
-  } catch (UException& e) {
+  auto signaler = [&](UException& e) {
     const Branch& branch = branches_[position];
     e.setLabel(branch.declared.empty() ? branch.label : branch.declared);
     if (evt != nullptr) {
@@ -161,6 +159,18 @@ bool Automate::raise(const std::string& label, Evt* evt) {
       temporary.adresseC(&e);
       exception(&temporary);
     }
+  };
+  try {
+    handler(evt);
+  } catch (const BaseIndisponible&) {
+    throw;  // nothing can go on without the database: the command ends
+  } catch (UException& e) {
+    signaler(e);
+  } catch (const std::exception& e) {
+    // Any other fault a handler lets out (an amount out of range, a library's error) is the
+    // runtime's too: reported with the handler's label, and the automaton stays alive.
+    UException fault(e.what());
+    signaler(fault);
   }
   return true;
 }

@@ -594,6 +594,13 @@ void QUARVOImport_generer::message_erreur(Evt* evt) {
   erreurMethode(0, evt);
 }
 
+void QUARVOImport_generer::exception(Evt* evt) {
+  Automate::exception(evt);
+  // The piece is not kept half-written, and the file it came from is not taken for imported.
+  abandonnerPiece();
+  pErreur_.set(int64_t{1});
+}
+
 void QUARVOImport_generer::sortie(Evt* evt) {
   sortieFaite();
   piece_.reset();  // a piece left open by a fault is not kept half-written

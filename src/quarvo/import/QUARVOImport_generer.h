@@ -96,6 +96,8 @@ class QUARVOImport_generer : public host::Parcours {
   void fin1(host::Evt* evt) override;
   void sortie(host::Evt* evt) override;
   void message_erreur(host::Evt* evt);
+  // A runtime fault in one of the handlers: reported, the piece abandoned, the caller told.
+  void exception(host::Evt* evt) override;
 
  private:
   // A call of the piece module's generation protocol; on failure runs "MESSAGE_ERREUR".

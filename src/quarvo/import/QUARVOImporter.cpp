@@ -133,6 +133,7 @@ void QUARVOImporter::validation(Evt* evt) {
     }
   }
 
+  bool generationEnEchec = false;
   for (size_t k = 0; k < kSortesImport.size(); ++k) {
     const auto& sorte = kSortesImport[k];
     Field& erreur = *erreurs_[k];
@@ -147,6 +148,7 @@ void QUARVOImporter::validation(Evt* evt) {
     vErreurGeneration_.set(int64_t{0});
     EvtParamRef generation{ref(vErreurGeneration_)};
     appelerModule("", "QUARVO", sorte.generation, &generation);
+    generationEnEchec = generationEnEchec || vErreurGeneration_.entier() != 0;
     // The file goes only when every one of its pieces was generated.
     if (erreur.entier() == 0 && vErreurGeneration_.entier() == 0) {
       std::error_code ec;
@@ -157,12 +159,15 @@ void QUARVOImporter::validation(Evt* evt) {
   int64_t somme = 0;
   for (auto* e : erreurs_) somme += e->entier();
   bool controleSeul = vMode_.entier() == 0;
-  message(somme == 0 ? (controleSeul ? "113" : "111") : (controleSeul ? "114" : "112"));
+  // A piece the purchasing module refused was not created and its file stays: the summary
+  // does not say the import ended without error.
+  bool propre = somme == 0 && !generationEnEchec;
+  message(propre ? (controleSeul ? "113" : "111") : (controleSeul ? "114" : "112"));
   if (somme != 0) {
     EvtParamVal liste{val(""), val("ach")};
     appelerProcedure("*", "COMMUN", "INTERFACE", "IMPORT_CONSULTER_ERREURS", &liste, -1);
   }
-  erreurMethode(somme == 0 ? 0 : 1, evt);
+  erreurMethode(propre ? 0 : 1, evt);
   sortir(nullptr, 0);
 }
 
