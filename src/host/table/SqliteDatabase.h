@@ -33,6 +33,8 @@ struct sqlite3_stmt;
 namespace quarvo::host {
 
 class SqliteStore;
+class SqliteStatements;
+class SqliteSchema;
 class CheckpointEnFond;
 
 class SqliteDatabase : public Database {
@@ -60,7 +62,7 @@ class SqliteDatabase : public Database {
 
   // A prepared statement from the cache, reset (its parameters keep their last bindings).
   sqlite3_stmt* prepare(const std::string& sql);
-  sqlite3* handle() { return db_; }
+  sqlite3* handle() { return db_.get(); }
   [[noreturn]] void fail(const std::string& what);
   // Reads may be answered from what the stores remember: only inside a transaction, where no
   // other connection can change the file.
@@ -74,20 +76,26 @@ class SqliteDatabase : public Database {
   int64_t checkpointsEnFond() const;
 
  private:
-  std::filesystem::path path_;
-  sqlite3* db_ = nullptr;
+  // Closes the connection when the database goes.
+  struct Fermeture {
+    void operator()(sqlite3* db) const;
+  };
+
   void executer(const std::string& sql);
   // Runs one cached statement that returns no rows.
   void pas(const std::string& sql);
   void oublierLectures();
   static int surCommit(void* self, sqlite3* db, const char* base, int pages);
 
+  std::filesystem::path path_;
+  std::unique_ptr<sqlite3, Fermeture> db_;  // before the members that use it: closed last
+  std::unique_ptr<SqliteStatements> statements_;
+  std::unique_ptr<SqliteSchema> schema_;
   int pagesCheckpoint_;
   std::unique_ptr<CheckpointEnFond> checkpoint_;  // started by the first commit that needs it
 
   int depth_ = 0;
   int64_t dataVersion_ = -1;
-  std::unordered_map<std::string, sqlite3_stmt*> statements_;
   std::unordered_map<std::string, std::unique_ptr<SqliteStore>> stores_;
   std::vector<SqliteStore*> enAttente_;  // stores holding updates not yet written
 };
