@@ -6,6 +6,7 @@
 #include <filesystem>
 #include <thread>
 
+#include "host/UException.h"
 #include "host/table/Table.h"
 #include "support/TestSession.h"
 
@@ -210,6 +211,49 @@ TEST_F(SqliteReadsTest, GroupedUnitsAreWholeOrAbsentAndCommittedByGroups) {
   }  // cut short: the open group is rolled back, as a crash would
   EXPECT_EQ(compter(), 4);
   EXPECT_EQ(t_.db().depth(), 0);
+}
+
+// A COMMIT that SQLite refuses leaves the transaction open, as SQLite does: the store must
+// not believe it closed, so that a rollback undoes the work whole (updates held in memory
+// included) and the connection goes on.
+TEST_F(SqliteReadsTest, ARefusedCommitLeavesTheTransactionOpenForItsRollback) {
+  t_.sql(R"(PRAGMA foreign_keys = ON;
+            CREATE TABLE "T_PARENT" ("IDENT" TEXT PRIMARY KEY);
+            CREATE TABLE "T_ENFANT" ("IDENT" TEXT PRIMARY KEY,
+              "PARENT" TEXT REFERENCES "T_PARENT" ("IDENT") DEFERRABLE INITIALLY DEFERRED);)");
+  Table enfant(nullptr, "VOVOVA", "T_ENFANT", "ECRITURE");
+  Table w(nullptr, "VOVOVA", "T_TEST", "ECRITURE");
+  auto inserer = [](Table& table, const char* ident, const char* parent) {
+    table.preparer();
+    table.ecrire("IDENT", Valeur::chaine(ident));
+    if (parent != nullptr) table.ecrire("PARENT", Valeur::chaine(parent));
+    ASSERT_EQ(table.inserer(), 0);
+  };
+  {
+    Transaction tx(t_.db());
+    {
+      Transaction sp(t_.db());
+      inserer(enfant, "e1", "absent");  // checked only at COMMIT
+      sp.commit();
+    }
+    EXPECT_EQ(t_.db().depth(), 1);
+    ASSERT_EQ(w.chercher(3, "IDENT", '=', Valeur::chaine("01")), 0);
+    w.ecrire("N", Valeur::entier(99));  // held in memory until the commit
+    ASSERT_EQ(w.modifier(), 0);
+    EXPECT_THROW(tx.commit(), UException);
+    EXPECT_EQ(t_.db().depth(), 1);
+  }  // rolled back
+  EXPECT_EQ(t_.db().depth(), 0);
+  EXPECT_EQ(t_.value("T_TEST", "N", "IDENT", "01"), "1");
+  EXPECT_EQ(t_.db().store("T_ENFANT")->count({}), 0);
+  {
+    Transaction tx(t_.db());
+    Table parent(nullptr, "VOVOVA", "T_PARENT", "ECRITURE");
+    inserer(parent, "p1", nullptr);
+    inserer(enfant, "e1", "p1");
+    tx.commit();
+  }
+  EXPECT_EQ(autre()->store("T_ENFANT")->count({}), 1);
 }
 
 // The log is copied into the file by the database's own thread once a commit leaves it past

@@ -123,6 +123,13 @@ void SqliteDatabase::oublierLectures() {
   for (auto& [name, store] : stores_) store->oublier();
 }
 
+void SqliteDatabase::abandonnerMemoire() {
+  // What waits was written after the savepoint being rolled back: it is dropped with it.
+  for (auto& [name, store] : stores_) store->abandonnerEnAttente();
+  enAttente_.clear();
+  oublierLectures();  // rows read or written in the undone work are no longer true
+}
+
 void SqliteDatabase::execScript(const std::string& sql) {
   oublierLectures();  // a script may change anything
   executer(sql);
@@ -157,20 +164,30 @@ void SqliteDatabase::begin() {
 void SqliteDatabase::commit() {
   if (depth_ == 0) throw UException("commit without a transaction");
   ecrireEnAttente();
-  --depth_;
-  if (depth_ == 0) {
-    executer("COMMIT");
-  } else {
-    pas("RELEASE sp" + std::to_string(depth_));
+  // The level is closed only once SQLite has closed it: a COMMIT refused (a deferred
+  // constraint, a lock another connection holds) leaves the transaction open, for the caller
+  // to roll back or to try again.
+  if (depth_ > 1) {
+    pas("RELEASE sp" + std::to_string(depth_ - 1));
+    --depth_;
+    return;
   }
+  try {
+    executer("COMMIT");
+  } catch (const UException&) {
+    if (sqlite3_get_autocommit(db_.get()) != 0) {
+      // SQLite gave the transaction up itself (an I/O error, a full disk): so does the store.
+      abandonnerMemoire();
+      depth_ = 0;
+    }
+    throw;
+  }
+  depth_ = 0;
 }
 
 void SqliteDatabase::rollback() {
   if (depth_ == 0) return;
-  // What waits was written after the savepoint being rolled back: it is dropped with it.
-  for (auto& [name, store] : stores_) store->abandonnerEnAttente();
-  enAttente_.clear();
-  oublierLectures();  // rows read or written in the undone work are no longer true
+  abandonnerMemoire();
   --depth_;
   if (depth_ == 0) {
     char* err = nullptr;

@@ -85,6 +85,8 @@ class SqliteDatabase : public Database {
   // Runs one cached statement that returns no rows.
   void pas(const std::string& sql);
   void oublierLectures();
+  // Drops the updates held and forgets every read: the work they belong to is undone.
+  void abandonnerMemoire();
   static int surCommit(void* self, sqlite3* db, const char* base, int pages);
 
   std::filesystem::path path_;
