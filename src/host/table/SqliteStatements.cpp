@@ -83,33 +83,78 @@ void bindStored(sqlite3_stmt* st, int n, const Valeur& v, sqlite3_destructor_typ
   }
 }
 
-void readColumn(sqlite3_stmt* st, int i, ColKind k, Valeur& out) {
+namespace {
+
+bool blanc(std::string_view text) {
+  return text.find_first_not_of(" \t") == std::string_view::npos;
+}
+
+bool montantLisible(std::string_view text) {
+  return blanc(text) || Monnaie::parse(text).has_value();
+}
+
+bool dateLisible(std::string_view text) {
+  return Date::parse(text).has_value();  // blank text is the empty date
+}
+
+// Whether every item of a list joined by ';' reads; a blank item is a value not given.
+bool listeLisible(std::string_view text, bool (*lisible)(std::string_view)) {
+  while (true) {
+    size_t fin = text.find(';');
+    if (!lisible(text.substr(0, fin))) return false;
+    if (fin == std::string_view::npos) return true;
+    text.remove_prefix(fin + 1);
+  }
+}
+
+}  // namespace
+
+bool readColumn(sqlite3_stmt* st, int i, ColKind k, Valeur& out) {
   int type = sqlite3_column_type(st, i);
   if (type == SQLITE_NULL) {
     out = defaultOf(k);
-    return;
+    return true;
   }
   switch (k) {
     case ColKind::Integer:
       out = Valeur::entier(sqlite3_column_int64(st, i));
-      return;
+      return true;
     case ColKind::Real:
       out = Valeur::dbl(sqlite3_column_double(st, i));
-      return;
+      return true;
     default:
       break;
   }
   std::string_view text(reinterpret_cast<const char*>(sqlite3_column_text(st, i)),
                         static_cast<size_t>(sqlite3_column_bytes(st, i)));
-  if (k == ColKind::Decimal) {
-    auto m = Monnaie::parse(text);
-    out = Valeur::monnaie(m ? *m : Monnaie());
-  } else if (k == ColKind::Date) {
-    auto d = Date::parse(text);
-    out = Valeur::date(d ? *d : Date());
-  } else {
-    out.assignerChaine(text);
+  switch (k) {
+    case ColKind::Decimal: {
+      if (blanc(text)) {
+        out = Valeur::monnaie(Monnaie());
+        return true;
+      }
+      auto m = Monnaie::parse(text);
+      if (!m) return false;
+      out = Valeur::monnaie(*m);
+      return true;
+    }
+    case ColKind::Date: {
+      auto d = Date::parse(text);
+      if (!d) return false;
+      out = Valeur::date(*d);
+      return true;
+    }
+    case ColKind::DecimalList:
+      if (!listeLisible(text, montantLisible)) return false;
+      break;
+    case ColKind::DateList:
+      if (!listeLisible(text, dateLisible)) return false;
+      break;
+    default:
+      break;
   }
+  out.assignerChaine(text);
+  return true;
 }
 
 }  // namespace quarvo::host

@@ -69,7 +69,9 @@ void bindAll(sqlite3_stmt* st, const std::vector<Valeur>& values, int first);
 // text is bound without a copy: `v` must then stay alive until the statement has run, and the
 // bindings be cleared after (ResetDelie).
 void bindStored(sqlite3_stmt* st, int n, const Valeur& v, sqlite3_destructor_type texte);
-// Reads column i of the current result row into `out`, in the kind `k`.
-void readColumn(sqlite3_stmt* st, int i, ColKind k, Valeur& out);
+// Reads column i of the current result row into `out`, in the kind `k`. NULL, and blank text
+// where an amount or a date is stored, are "no value" (defaultOf). False, `out` unchanged, when
+// the stored text is not of the kind: an amount, a date, or a list of them that does not read.
+[[nodiscard]] bool readColumn(sqlite3_stmt* st, int i, ColKind k, Valeur& out);
 
 }  // namespace quarvo::host

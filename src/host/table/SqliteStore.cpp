@@ -5,6 +5,24 @@
 
 namespace quarvo::host {
 
+namespace {
+// What a column of kind `k` holds, for the error that names a stored value it cannot read.
+const char* formeAttendue(ColKind k) {
+  switch (k) {
+    case ColKind::Decimal:
+      return "an amount";
+    case ColKind::Date:
+      return "a date";
+    case ColKind::DecimalList:
+      return "a list of amounts";
+    case ColKind::DateList:
+      return "a list of dates";
+    default:
+      return "of its column's kind";
+  }
+}
+}  // namespace
+
 SqliteStore::SqliteStore(SqliteDatabase& db, SqliteStatements& statements, std::string name,
                          DescriptionTable description)
     : db_(db),
@@ -137,7 +155,14 @@ bool SqliteStore::lireLigne(RowId id, Row& out) {
   const auto& cols = description_.schema.columns();
   out.values.resize(cols.size());
   for (size_t i = 0; i < cols.size(); ++i) {
-    readColumn(st, static_cast<int>(i), cols[i].kind, out.values[i]);
+    if (!readColumn(st, static_cast<int>(i), cols[i].kind, out.values[i])) {
+      // Written behind the runtime's back: reading it as "no value" would give a wrong
+      // figure without a word.
+      const unsigned char* texte = sqlite3_column_text(st, static_cast<int>(i));
+      throw UException(name_ + "." + cols[i].name + ": stored value '" +
+                       (texte ? reinterpret_cast<const char*>(texte) : "") + "' is not " +
+                       formeAttendue(cols[i].kind));
+    }
   }
   return true;
 }
