@@ -149,6 +149,9 @@ TEST_F(SqliteReadsTest, UpdatesHeldInMemoryAreSeenByEveryReadAndDroppedByARollba
     ecrireN(10);
     ecrireN(11);
     EXPECT_EQ(n01(), "11");
+    EXPECT_EQ(
+        t_.db().interroger(R"(SELECT "N" FROM "T_TEST" WHERE "IDENT" = ?)", {Valeur::chaine("01")}),
+        (std::vector<std::vector<std::string>>{{"11"}}));
     EXPECT_EQ(t_.db().store("T_TEST")->count({{"N", '=', Valeur::entier(11)}}), 1);
     EXPECT_EQ(parNom("a"), "01:11;");
     {
@@ -177,6 +180,18 @@ TEST_F(SqliteReadsTest, UpdatesHeldInMemoryAreSeenByEveryReadAndDroppedByARollba
   }  // rolled back whole
   EXPECT_EQ(n01(), "50");
   EXPECT_EQ(lecteur->store("T_TEST")->count({{"N", '=', Valeur::entier(50)}}), 1);
+}
+
+// Tests and tools read the tables in SQL through the database; that path must not become a way
+// around the store's memory: a write or a transaction statement is refused.
+TEST_F(SqliteReadsTest, ASqlQueryOnlyReads) {
+  for (const char* sql : {R"(UPDATE "T_TEST" SET "N" = 0)", R"(SELECT 1; DELETE FROM "T_TEST")",
+                          "BEGIN", "COMMIT", "PRAGMA foreign_keys = ON", "SELECT nothing"}) {
+    EXPECT_THROW(t_.db().interroger(sql), UException) << sql;
+  }
+  EXPECT_EQ(t_.db().interroger(R"(SELECT "IDENT", "N", NULL FROM "T_TEST" ORDER BY 1)"),
+            (std::vector<std::vector<std::string>>{{"01", "1", ""}, {"02", "2", ""}}));
+  EXPECT_EQ(t_.db().depth(), 0);
 }
 
 TEST_F(SqliteReadsTest, GroupedUnitsAreWholeOrAbsentAndCommittedByGroups) {

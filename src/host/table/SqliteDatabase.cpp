@@ -3,6 +3,7 @@
 #include <sqlite3.h>
 
 #include <algorithm>
+#include <string_view>
 
 #include "host/UException.h"
 #include "host/table/CheckpointEnFond.h"
@@ -85,6 +86,38 @@ void SqliteDatabase::fail(const std::string& what) {
 
 sqlite3_stmt* SqliteDatabase::prepare(const std::string& sql) {
   return statements_->prepare(sql);
+}
+
+std::vector<std::vector<std::string>> SqliteDatabase::interroger(
+    const std::string& sql, const std::vector<Valeur>& parametres) {
+  ecrireEnAttente();  // the file must hold what the query reads
+  sqlite3_stmt* brut = nullptr;
+  const char* reste = nullptr;
+  if (sqlite3_prepare_v2(db_.get(), sql.c_str(), static_cast<int>(sql.size()), &brut, &reste) !=
+      SQLITE_OK) {
+    fail("query " + sql);
+  }
+  std::unique_ptr<sqlite3_stmt, Finaliser> st(brut);
+  // BEGIN, COMMIT, SAVEPOINT and ATTACH count as read-only for SQLite but return no rows.
+  bool seule = reste == nullptr ||
+               std::string_view(reste).find_first_not_of(" \t\r\n;") == std::string_view::npos;
+  if (!st || !seule || sqlite3_stmt_readonly(st.get()) == 0 ||
+      sqlite3_column_count(st.get()) == 0) {
+    throw UException("not a read-only query: " + sql);
+  }
+  bindAll(st.get(), parametres, 1);
+  std::vector<std::vector<std::string>> lignes;
+  const int colonnes = sqlite3_column_count(st.get());
+  int rc;
+  while ((rc = sqlite3_step(st.get())) == SQLITE_ROW) {
+    auto& ligne = lignes.emplace_back();
+    for (int i = 0; i < colonnes; ++i) {
+      const unsigned char* texte = sqlite3_column_text(st.get(), i);
+      ligne.emplace_back(texte ? reinterpret_cast<const char*>(texte) : "");
+    }
+  }
+  if (rc != SQLITE_DONE) fail("query " + sql);
+  return lignes;
 }
 
 TableStore* SqliteDatabase::store(const std::string& table) {

@@ -60,9 +60,23 @@ class SqliteDatabase : public Database {
   void rollback() override;
   int depth() const override { return depth_; }
 
+  // The rows of one read-only SQL query (tools and tests that read what the tables hold), each
+  // value as SQLite's text of it, NULL as empty text. `parametres` are bound to the query's
+  // parameters in order. Runs on this connection, inside its open transaction if any, after
+  // the updates the stores hold in memory are written. Throws UException when the text is not
+  // one query that only reads, or when SQLite refuses it.
+  std::vector<std::vector<std::string>> interroger(const std::string& sql,
+                                                   const std::vector<Valeur>& parametres = {});
+  // Copies of the log into the file done so far by the background thread.
+  int64_t checkpointsEnFond() const;
+
+ private:
+  // The raw connection is the store's alone: a read through it would miss the updates the
+  // stores hold in memory, a write would leave their memory stale.
+  friend class SqliteStore;
+  sqlite3* handle() { return db_.get(); }
   // A prepared statement from the cache, reset (its parameters keep their last bindings).
   sqlite3_stmt* prepare(const std::string& sql);
-  sqlite3* handle() { return db_.get(); }
   [[noreturn]] void fail(const std::string& what);
   // Reads may be answered from what the stores remember: only inside a transaction, where no
   // other connection can change the file.
@@ -72,10 +86,6 @@ class SqliteDatabase : public Database {
   // dropped by a rollback.
   void noterEnAttente(SqliteStore* store);
   void ecrireEnAttente();
-  // Copies of the log into the file done so far by the background thread.
-  int64_t checkpointsEnFond() const;
-
- private:
   // Closes the connection when the database goes.
   struct Fermeture {
     void operator()(sqlite3* db) const;

@@ -56,6 +56,11 @@ struct ResetDelie {
   }
 };
 
+// Finalizes a statement prepared outside the cache (one-off queries).
+struct Finaliser {
+  void operator()(sqlite3_stmt* st) const { sqlite3_finalize(st); }
+};
+
 // An identifier quoted for SQL text ("NAME", with inner quotes doubled).
 std::string sqlIdent(const std::string& identifier);
 
