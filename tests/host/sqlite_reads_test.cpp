@@ -123,6 +123,69 @@ TEST_F(SqliteReadsTest, AnUpdateWritesOnlyTheColumnsItChanged) {
   EXPECT_EQ(t_.value("T_TEST", "N", "IDENT", "01"), "3");
 }
 
+// A trigger may write other tables than its own, and fire their triggers in turn: whatever a
+// statement writes through them must be read again, remembered rows and selections alike,
+// including when the triggers appear after the tables were first read.
+TEST_F(SqliteReadsTest, TablesWrittenByTriggersAreReadAgainAfterTheStatementsThatFireThem) {
+  t_.sql(R"(CREATE TABLE "T_B" ("IDENT" TEXT PRIMARY KEY, "V" INTEGER DEFAULT 0);
+            CREATE TABLE "T_C" ("IDENT" TEXT PRIMARY KEY, "V" INTEGER DEFAULT 0);
+            INSERT INTO "T_B" VALUES ('b1', 0); INSERT INTO "T_C" VALUES ('c1', 0);)");
+  Table w(nullptr, "VOVOVA", "T_TEST", "ECRITURE");
+  auto lire = [&](const char* table, const char* ident) {
+    Table c(nullptr, "VOVOVA", table, "LECTURE");
+    return c.chercher(3, "IDENT", '=', Valeur::chaine(ident)) == 0 ? c.valeur("V").toChaine()
+                                                                   : std::string("-");
+  };
+  auto parV = [&](const char* table, int64_t v) {
+    Table c(nullptr, "VOVOVA", table, "LECTURE");
+    c.effacerCriteres();
+    c.ajouterCritere("V", '=', Valeur::entier(v));
+    c.ouvrir();
+    std::string out;
+    while (c.lire(1) == 0) out += c.valeur("IDENT").toChaine() + ";";
+    return out;
+  };
+  auto ecrireN = [&](int64_t n) {
+    ASSERT_EQ(w.chercher(3, "IDENT", '=', Valeur::chaine("01")), 0);
+    w.ecrire("N", Valeur::entier(n));
+    ASSERT_EQ(w.modifier(), 0);
+  };
+  {
+    Transaction tx(t_.db());  // every table is read, and remembered, before any trigger exists
+    EXPECT_EQ(lire("T_B", "b1"), "0");
+    EXPECT_EQ(lire("T_C", "c1"), "0");
+    ecrireN(1);
+    tx.commit();
+  }
+  t_.sql(R"(CREATE TRIGGER "TR_T_TEST_B" AFTER UPDATE OF "N" ON "T_TEST" BEGIN
+              UPDATE "T_B" SET "V" = NEW."N" WHERE "IDENT" = 'b1';
+            END;
+            CREATE TRIGGER "TR_T_B_C" AFTER UPDATE OF "V" ON "T_B" BEGIN
+              UPDATE "T_C" SET "V" = NEW."V" * 10 WHERE "IDENT" = 'c1';
+            END;
+            CREATE TRIGGER "TR_T_TEST_NOUVEAU" AFTER INSERT ON "T_TEST" BEGIN
+              INSERT INTO "T_B" ("IDENT", "V") VALUES (NEW."IDENT", 7);
+            END;
+            CREATE TRIGGER "TR_T_TEST_SUPPRIME" AFTER DELETE ON "T_TEST" BEGIN
+              DELETE FROM "T_B" WHERE "IDENT" = OLD."IDENT";
+            END;)");
+  Transaction tx(t_.db());
+  EXPECT_EQ(lire("T_B", "b1"), "0");
+  EXPECT_EQ(lire("T_C", "c1"), "0");
+  EXPECT_EQ(parV("T_B", 7), "");
+  ecrireN(2);  // T_TEST -> T_B -> T_C
+  EXPECT_EQ(lire("T_B", "b1"), "2");
+  EXPECT_EQ(lire("T_C", "c1"), "20");
+  w.preparer();
+  w.ecrire("IDENT", Valeur::chaine("03"));
+  ASSERT_EQ(w.inserer(), 0);
+  EXPECT_EQ(parV("T_B", 7), "03;");
+  ASSERT_EQ(w.supprimer('N'), 0);
+  EXPECT_EQ(parV("T_B", 7), "");
+  EXPECT_EQ(lire("T_B", "03"), "-");
+  tx.commit();
+}
+
 // Inside a transaction an update of a remembered row waits in memory: every read must see it
 // all the same (cursors, SQL selections and counts, scripts, triggers of other tables), a
 // rolled-back savepoint must drop it, and the commit must write it.

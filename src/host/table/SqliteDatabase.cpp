@@ -3,6 +3,7 @@
 #include <sqlite3.h>
 
 #include <algorithm>
+#include <cctype>
 #include <string_view>
 
 #include "host/UException.h"
@@ -163,9 +164,37 @@ void SqliteDatabase::abandonnerMemoire() {
   oublierLectures();  // rows read or written in the undone work are no longer true
 }
 
+void SqliteDatabase::oublierCibles(const CiblesDeclencheurs& cibles) {
+  if (cibles.toutes) {
+    oublierLectures();
+    return;
+  }
+  if (cibles.tables.empty()) return;
+  for (auto& [name, store] : stores_) {
+    std::string nom = name;
+    for (char& c : nom) c = static_cast<char>(std::toupper(static_cast<unsigned char>(c)));
+    if (std::find(cibles.tables.begin(), cibles.tables.end(), nom) != cibles.tables.end()) {
+      store->oublier();
+    }
+  }
+}
+
+void SqliteDatabase::verifierSchema() {
+  SqliteSchema::Version version = schema_->version();
+  if (version == versionSchema_) return;
+  versionSchema_ = version;
+  for (auto& [name, store] : stores_) store->reapprendre(schema_->decrire(name));
+}
+
 void SqliteDatabase::execScript(const std::string& sql) {
-  oublierLectures();  // a script may change anything
-  executer(sql);
+  oublierLectures();  // a script may change anything, the schema included
+  try {
+    executer(sql);
+  } catch (const UException&) {
+    verifierSchema();  // what ran before the failing statement stays
+    throw;
+  }
+  verifierSchema();
 }
 
 void SqliteDatabase::executer(const std::string& sql) {
@@ -186,7 +215,10 @@ void SqliteDatabase::begin() {
     sqlite3_stmt* st = prepare("PRAGMA data_version");
     Reset reset{st};
     int64_t version = sqlite3_step(st) == SQLITE_ROW ? sqlite3_column_int64(st, 0) : -1;
-    if (version != dataVersion_ || version < 0) oublierLectures();
+    if (version != dataVersion_ || version < 0) {
+      oublierLectures();
+      verifierSchema();
+    }
     dataVersion_ = version;
   } else {
     pas("SAVEPOINT sp" + std::to_string(depth_));

@@ -2,16 +2,20 @@
 //
 // Column kinds come from the declared column types of the schema (see db/schema.sql): TEXT,
 // INTEGER, REAL, DECIMAL_TEXT (exact decimal as canonical text), DATE_TEXT (ISO date, '' when
-// none), TIME_TEXT, DECIMAL_LIST_TEXT and DATE_LIST_TEXT (values joined by ';'). Every value is
-// bound as a parameter; identifiers are checked against the schema before they reach SQL text.
-// Several processes may share one file: writers wait for each other (busy timeout). A connection
-// belongs to one thread.
+// none), TIME_TEXT, DECIMAL_LIST_TEXT and DATE_LIST_TEXT (values joined by ';'). An amount or
+// a date stored in a form that does not read is a UException naming table, column and value;
+// NULL and blank text are "no value". Every value is bound as a parameter; identifiers are
+// checked against the schema before they reach SQL text. Several processes may share one file:
+// writers wait for each other (busy timeout). A connection belongs to one thread.
 //
 // Inside a transaction, small selections and the rows they give are remembered per table and
 // answered from memory when asked again: a batch looks up the same reference rows for every
-// line. A write to a table forgets its selections (and the written row); a rollback or a script
-// forgets everything; so does a new transaction when another connection committed meanwhile.
-// Outside transactions every read goes to the file. An update of a remembered row that fires
+// line. A write to a table forgets its selections (and the written row); a write that may fire
+// a trigger also forgets every table the trigger's body (or a trigger it fires) may write, as
+// read from the trigger's text, and every table when that text is not understood; a rollback or
+// a script forgets everything; so does a new transaction when another connection committed
+// meanwhile, and the triggers are read again when the schema changed. Outside transactions
+// every read goes to the file. An update of a remembered row that fires
 // no trigger and touches no key, index or checked column is held in that row until the
 // transaction reaches its next savepoint or commit, or a statement may read the table; a
 // rollback drops it (see SqliteStore::update).
@@ -24,6 +28,7 @@
 #include <cstdint>
 #include <memory>
 #include <unordered_map>
+#include <utility>
 
 #include "host/table/Database.h"
 
@@ -35,6 +40,7 @@ namespace quarvo::host {
 class SqliteStore;
 class SqliteStatements;
 class SqliteSchema;
+struct CiblesDeclencheurs;
 class CheckpointEnFond;
 
 class SqliteDatabase : public Database {
@@ -86,6 +92,9 @@ class SqliteDatabase : public Database {
   // dropped by a rollback.
   void noterEnAttente(SqliteStore* store);
   void ecrireEnAttente();
+  // Forgets what the stores of the tables a trigger may write remember. REQUIRES: nothing
+  // held (ecrireEnAttente ran).
+  void oublierCibles(const CiblesDeclencheurs& cibles);
   // Closes the connection when the database goes.
   struct Fermeture {
     void operator()(sqlite3* db) const;
@@ -97,6 +106,9 @@ class SqliteDatabase : public Database {
   void oublierLectures();
   // Drops the updates held and forgets every read: the work they belong to is undone.
   void abandonnerMemoire();
+  // After a script, or when another connection committed: when the schema changed, every
+  // store learns its table's indexes and triggers again.
+  void verifierSchema();
   static int surCommit(void* self, sqlite3* db, const char* base, int pages);
 
   std::filesystem::path path_;
@@ -108,6 +120,7 @@ class SqliteDatabase : public Database {
 
   int depth_ = 0;
   int64_t dataVersion_ = -1;
+  std::pair<int64_t, int64_t> versionSchema_{-1, -1};  // what the stores were described from
   std::unordered_map<std::string, std::unique_ptr<SqliteStore>> stores_;
   std::vector<SqliteStore*> enAttente_;  // stores holding updates not yet written
 };

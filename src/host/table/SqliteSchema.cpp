@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <cctype>
+#include <unordered_set>
 
 #include "host/table/SqliteStatements.h"
 
@@ -36,7 +37,74 @@ DescriptionTable SqliteSchema::decrire(const std::string& table) {
     noterDeclencheur(sql ? reinterpret_cast<const char*>(sql) : "", d);
     d.aDesDeclencheurs = true;
   }
+  lireDeclencheurs();
+  d.cibles = cibles(table);
   return d;
+}
+
+namespace {
+std::string majuscules(std::string s) {
+  for (char& c : s) c = static_cast<char>(std::toupper(static_cast<unsigned char>(c)));
+  return s;
+}
+}  // namespace
+
+SqliteSchema::Version SqliteSchema::version() {
+  auto lire = [&](const char* sql) {
+    sqlite3_stmt* st = statements_.prepare(sql);
+    Reset reset{st};
+    if (sqlite3_step(st) != SQLITE_ROW) statements_.fail(sql);
+    return sqlite3_column_int64(st, 0);
+  };
+  return {lire("PRAGMA main.schema_version"), lire("PRAGMA temp.schema_version")};
+}
+
+void SqliteSchema::lireDeclencheurs() {
+  Version v = version();
+  if (v == lus_) return;
+  lus_ = v;
+  declencheurs_.clear();
+  sqlite3_stmt* st = statements_.prepare(
+      "SELECT tbl_name, sql FROM sqlite_master WHERE type = 'trigger' "
+      "UNION ALL SELECT tbl_name, sql FROM sqlite_temp_master WHERE type = 'trigger'");
+  Reset reset{st};
+  while (sqlite3_step(st) == SQLITE_ROW) {
+    const unsigned char* table = sqlite3_column_text(st, 0);
+    const unsigned char* sql = sqlite3_column_text(st, 1);
+    std::string nom = table ? reinterpret_cast<const char*>(table) : "";
+    declencheurs_.emplace(majuscules(nom),
+                          lireDeclencheur(sql ? reinterpret_cast<const char*>(sql) : "", nom));
+  }
+}
+
+// The tables written by the triggers a statement on `table` may fire, and by the triggers
+// those writes fire in turn. A trigger that writes only the row that fired it adds nothing:
+// the store reads that row again itself.
+CiblesDeclencheurs SqliteSchema::cibles(const std::string& table) const {
+  CiblesDeclencheurs c;
+  std::vector<std::string> aVoir{majuscules(table)};
+  std::unordered_set<std::string> vues{aVoir.front()};
+  while (!aVoir.empty()) {
+    std::string courante = std::move(aVoir.back());
+    aVoir.pop_back();
+    auto [debut, fin] = declencheurs_.equal_range(courante);
+    for (auto it = debut; it != fin; ++it) {
+      const Declencheur& d = it->second;
+      if (!d.compris) {
+        c.toutes = true;
+        c.tables.clear();
+        return c;
+      }
+      for (const auto& e : d.ecritures) {
+        if (!e.ligneDeclencheuse &&
+            std::find(c.tables.begin(), c.tables.end(), e.table) == c.tables.end()) {
+          c.tables.push_back(e.table);
+        }
+        if (vues.insert(e.table).second) aVoir.push_back(e.table);
+      }
+    }
+  }
+  return c;
 }
 
 std::vector<std::string> SqliteSchema::tables() {

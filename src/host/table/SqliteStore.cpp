@@ -51,6 +51,24 @@ SqliteStore::SqliteStore(SqliteDatabase& db, SqliteStatements& statements, std::
   updateSql_ = "UPDATE " + sqlIdent(name_) + " SET " + sets + " WHERE rowid = ?";
 }
 
+void SqliteStore::reapprendre(DescriptionTable description) {
+  const auto& avant = description_.schema.columns();
+  const auto& apres = description.schema.columns();
+  bool memes = avant.size() == apres.size();
+  for (size_t i = 0; memes && i < avant.size(); ++i) {
+    memes = avant[i].name == apres[i].name && avant[i].kind == apres[i].kind;
+  }
+  if (!memes) {
+    description_.differables.assign(avant.size(), false);
+    description_.declencheTout = true;
+    description_.aDesDeclencheurs = true;
+    description_.cibles = CiblesDeclencheurs{true, {}};
+    return;
+  }
+  description.schema = std::move(description_.schema);
+  description_ = std::move(description);
+}
+
 void SqliteStore::oublier() {
   ecrireEnAttente();
   memoire_.vider();
@@ -265,10 +283,12 @@ void SqliteStore::executerUpdate(RowId id, const Row& row, const std::vector<siz
 
 // Before a statement that writes this table: what waits is written first, so that the file
 // sees the writes in order; everything that waits when the statement may fire a trigger, which
-// may read or write any table, otherwise only this table's.
+// may read any table, otherwise only this table's. The tables the triggers may write are
+// forgotten: what they remember will not be true after the statement.
 void SqliteStore::ecrireAvant(bool declenche) {
   if (declenche) {
     db_.ecrireEnAttente();
+    db_.oublierCibles(description_.cibles);
   } else {
     ecrireEnAttente();
   }

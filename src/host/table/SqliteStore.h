@@ -46,6 +46,10 @@ class SqliteStore : public TableStore {
   void ecrireEnAttente();
   // Drops the updates held in memory: the savepoint they belong to is rolled back.
   void abandonnerEnAttente() { memoire_.abandonnerEnAttente(); }
+  // Takes what the schema now says of the table's indexes and triggers. Its columns stay as
+  // cursors know them: when they changed, every write is taken as one that may fire a trigger
+  // writing any table. REQUIRES: nothing remembered or held (the schema just changed).
+  void reapprendre(DescriptionTable description);
 
  private:
   std::vector<RowId> lireSelection(const std::vector<Criterion>& criteria,
@@ -54,6 +58,7 @@ class SqliteStore : public TableStore {
   // Column i of `row` in the column's kind, as it will be stored.
   Valeur ajustee(const Row& row, size_t i) const;
   void executerUpdate(RowId id, const Row& row, const std::vector<size_t>& ecrites);
+  // Before a statement that writes this table; `declenche` when it may fire a trigger.
   void ecrireAvant(bool declenche);
   void step(sqlite3_stmt* st, const char* what);
   std::string where(const std::vector<Criterion>& criteria, std::vector<Valeur>& binds);
