@@ -6,6 +6,7 @@
 #include <filesystem>
 #include <thread>
 
+#include "host/UException.h"
 #include "host/table/Table.h"
 #include "support/TestSession.h"
 
@@ -122,6 +123,69 @@ TEST_F(SqliteReadsTest, AnUpdateWritesOnlyTheColumnsItChanged) {
   EXPECT_EQ(t_.value("T_TEST", "N", "IDENT", "01"), "3");
 }
 
+// A trigger may write other tables than its own, and fire their triggers in turn: whatever a
+// statement writes through them must be read again, remembered rows and selections alike,
+// including when the triggers appear after the tables were first read.
+TEST_F(SqliteReadsTest, TablesWrittenByTriggersAreReadAgainAfterTheStatementsThatFireThem) {
+  t_.sql(R"(CREATE TABLE "T_B" ("IDENT" TEXT PRIMARY KEY, "V" INTEGER DEFAULT 0);
+            CREATE TABLE "T_C" ("IDENT" TEXT PRIMARY KEY, "V" INTEGER DEFAULT 0);
+            INSERT INTO "T_B" VALUES ('b1', 0); INSERT INTO "T_C" VALUES ('c1', 0);)");
+  Table w(nullptr, "VOVOVA", "T_TEST", "ECRITURE");
+  auto lire = [&](const char* table, const char* ident) {
+    Table c(nullptr, "VOVOVA", table, "LECTURE");
+    return c.chercher(3, "IDENT", '=', Valeur::chaine(ident)) == 0 ? c.valeur("V").toChaine()
+                                                                   : std::string("-");
+  };
+  auto parV = [&](const char* table, int64_t v) {
+    Table c(nullptr, "VOVOVA", table, "LECTURE");
+    c.effacerCriteres();
+    c.ajouterCritere("V", '=', Valeur::entier(v));
+    c.ouvrir();
+    std::string out;
+    while (c.lire(1) == 0) out += c.valeur("IDENT").toChaine() + ";";
+    return out;
+  };
+  auto ecrireN = [&](int64_t n) {
+    ASSERT_EQ(w.chercher(3, "IDENT", '=', Valeur::chaine("01")), 0);
+    w.ecrire("N", Valeur::entier(n));
+    ASSERT_EQ(w.modifier(), 0);
+  };
+  {
+    Transaction tx(t_.db());  // every table is read, and remembered, before any trigger exists
+    EXPECT_EQ(lire("T_B", "b1"), "0");
+    EXPECT_EQ(lire("T_C", "c1"), "0");
+    ecrireN(1);
+    tx.commit();
+  }
+  t_.sql(R"(CREATE TRIGGER "TR_T_TEST_B" AFTER UPDATE OF "N" ON "T_TEST" BEGIN
+              UPDATE "T_B" SET "V" = NEW."N" WHERE "IDENT" = 'b1';
+            END;
+            CREATE TRIGGER "TR_T_B_C" AFTER UPDATE OF "V" ON "T_B" BEGIN
+              UPDATE "T_C" SET "V" = NEW."V" * 10 WHERE "IDENT" = 'c1';
+            END;
+            CREATE TRIGGER "TR_T_TEST_NOUVEAU" AFTER INSERT ON "T_TEST" BEGIN
+              INSERT INTO "T_B" ("IDENT", "V") VALUES (NEW."IDENT", 7);
+            END;
+            CREATE TRIGGER "TR_T_TEST_SUPPRIME" AFTER DELETE ON "T_TEST" BEGIN
+              DELETE FROM "T_B" WHERE "IDENT" = OLD."IDENT";
+            END;)");
+  Transaction tx(t_.db());
+  EXPECT_EQ(lire("T_B", "b1"), "0");
+  EXPECT_EQ(lire("T_C", "c1"), "0");
+  EXPECT_EQ(parV("T_B", 7), "");
+  ecrireN(2);  // T_TEST -> T_B -> T_C
+  EXPECT_EQ(lire("T_B", "b1"), "2");
+  EXPECT_EQ(lire("T_C", "c1"), "20");
+  w.preparer();
+  w.ecrire("IDENT", Valeur::chaine("03"));
+  ASSERT_EQ(w.inserer(), 0);
+  EXPECT_EQ(parV("T_B", 7), "03;");
+  ASSERT_EQ(w.supprimer('N'), 0);
+  EXPECT_EQ(parV("T_B", 7), "");
+  EXPECT_EQ(lire("T_B", "03"), "-");
+  tx.commit();
+}
+
 // Inside a transaction an update of a remembered row waits in memory: every read must see it
 // all the same (cursors, SQL selections and counts, scripts, triggers of other tables), a
 // rolled-back savepoint must drop it, and the commit must write it.
@@ -148,6 +212,9 @@ TEST_F(SqliteReadsTest, UpdatesHeldInMemoryAreSeenByEveryReadAndDroppedByARollba
     ecrireN(10);
     ecrireN(11);
     EXPECT_EQ(n01(), "11");
+    EXPECT_EQ(
+        t_.db().interroger(R"(SELECT "N" FROM "T_TEST" WHERE "IDENT" = ?)", {Valeur::chaine("01")}),
+        (std::vector<std::vector<std::string>>{{"11"}}));
     EXPECT_EQ(t_.db().store("T_TEST")->count({{"N", '=', Valeur::entier(11)}}), 1);
     EXPECT_EQ(parNom("a"), "01:11;");
     {
@@ -176,6 +243,18 @@ TEST_F(SqliteReadsTest, UpdatesHeldInMemoryAreSeenByEveryReadAndDroppedByARollba
   }  // rolled back whole
   EXPECT_EQ(n01(), "50");
   EXPECT_EQ(lecteur->store("T_TEST")->count({{"N", '=', Valeur::entier(50)}}), 1);
+}
+
+// Tests and tools read the tables in SQL through the database; that path must not become a way
+// around the store's memory: a write or a transaction statement is refused.
+TEST_F(SqliteReadsTest, ASqlQueryOnlyReads) {
+  for (const char* sql : {R"(UPDATE "T_TEST" SET "N" = 0)", R"(SELECT 1; DELETE FROM "T_TEST")",
+                          "BEGIN", "COMMIT", "PRAGMA foreign_keys = ON", "SELECT nothing"}) {
+    EXPECT_THROW(t_.db().interroger(sql), UException) << sql;
+  }
+  EXPECT_EQ(t_.db().interroger(R"(SELECT "IDENT", "N", NULL FROM "T_TEST" ORDER BY 1)"),
+            (std::vector<std::vector<std::string>>{{"01", "1", ""}, {"02", "2", ""}}));
+  EXPECT_EQ(t_.db().depth(), 0);
 }
 
 TEST_F(SqliteReadsTest, GroupedUnitsAreWholeOrAbsentAndCommittedByGroups) {
@@ -210,6 +289,49 @@ TEST_F(SqliteReadsTest, GroupedUnitsAreWholeOrAbsentAndCommittedByGroups) {
   }  // cut short: the open group is rolled back, as a crash would
   EXPECT_EQ(compter(), 4);
   EXPECT_EQ(t_.db().depth(), 0);
+}
+
+// A COMMIT that SQLite refuses leaves the transaction open, as SQLite does: the store must
+// not believe it closed, so that a rollback undoes the work whole (updates held in memory
+// included) and the connection goes on.
+TEST_F(SqliteReadsTest, ARefusedCommitLeavesTheTransactionOpenForItsRollback) {
+  t_.sql(R"(PRAGMA foreign_keys = ON;
+            CREATE TABLE "T_PARENT" ("IDENT" TEXT PRIMARY KEY);
+            CREATE TABLE "T_ENFANT" ("IDENT" TEXT PRIMARY KEY,
+              "PARENT" TEXT REFERENCES "T_PARENT" ("IDENT") DEFERRABLE INITIALLY DEFERRED);)");
+  Table enfant(nullptr, "VOVOVA", "T_ENFANT", "ECRITURE");
+  Table w(nullptr, "VOVOVA", "T_TEST", "ECRITURE");
+  auto inserer = [](Table& table, const char* ident, const char* parent) {
+    table.preparer();
+    table.ecrire("IDENT", Valeur::chaine(ident));
+    if (parent != nullptr) table.ecrire("PARENT", Valeur::chaine(parent));
+    ASSERT_EQ(table.inserer(), 0);
+  };
+  {
+    Transaction tx(t_.db());
+    {
+      Transaction sp(t_.db());
+      inserer(enfant, "e1", "absent");  // checked only at COMMIT
+      sp.commit();
+    }
+    EXPECT_EQ(t_.db().depth(), 1);
+    ASSERT_EQ(w.chercher(3, "IDENT", '=', Valeur::chaine("01")), 0);
+    w.ecrire("N", Valeur::entier(99));  // held in memory until the commit
+    ASSERT_EQ(w.modifier(), 0);
+    EXPECT_THROW(tx.commit(), UException);
+    EXPECT_EQ(t_.db().depth(), 1);
+  }  // rolled back
+  EXPECT_EQ(t_.db().depth(), 0);
+  EXPECT_EQ(t_.value("T_TEST", "N", "IDENT", "01"), "1");
+  EXPECT_EQ(t_.db().store("T_ENFANT")->count({}), 0);
+  {
+    Transaction tx(t_.db());
+    Table parent(nullptr, "VOVOVA", "T_PARENT", "ECRITURE");
+    inserer(parent, "p1", nullptr);
+    inserer(enfant, "e1", "p1");
+    tx.commit();
+  }
+  EXPECT_EQ(autre()->store("T_ENFANT")->count({}), 1);
 }
 
 // The log is copied into the file by the database's own thread once a commit leaves it past

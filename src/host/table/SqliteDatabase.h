@@ -2,16 +2,20 @@
 //
 // Column kinds come from the declared column types of the schema (see db/schema.sql): TEXT,
 // INTEGER, REAL, DECIMAL_TEXT (exact decimal as canonical text), DATE_TEXT (ISO date, '' when
-// none), TIME_TEXT, DECIMAL_LIST_TEXT and DATE_LIST_TEXT (values joined by ';'). Every value is
-// bound as a parameter; identifiers are checked against the schema before they reach SQL text.
-// Several processes may share one file: writers wait for each other (busy timeout). A connection
-// belongs to one thread.
+// none), TIME_TEXT, DECIMAL_LIST_TEXT and DATE_LIST_TEXT (values joined by ';'). An amount or
+// a date stored in a form that does not read is a UException naming table, column and value;
+// NULL and blank text are "no value". Every value is bound as a parameter; identifiers are
+// checked against the schema before they reach SQL text. Several processes may share one file:
+// writers wait for each other (busy timeout). A connection belongs to one thread.
 //
 // Inside a transaction, small selections and the rows they give are remembered per table and
 // answered from memory when asked again: a batch looks up the same reference rows for every
-// line. A write to a table forgets its selections (and the written row); a rollback or a script
-// forgets everything; so does a new transaction when another connection committed meanwhile.
-// Outside transactions every read goes to the file. An update of a remembered row that fires
+// line. A write to a table forgets its selections (and the written row); a write that may fire
+// a trigger also forgets every table the trigger's body (or a trigger it fires) may write, as
+// read from the trigger's text, and every table when that text is not understood; a rollback or
+// a script forgets everything; so does a new transaction when another connection committed
+// meanwhile, and the triggers are read again when the schema changed. Outside transactions
+// every read goes to the file. An update of a remembered row that fires
 // no trigger and touches no key, index or checked column is held in that row until the
 // transaction reaches its next savepoint or commit, or a statement may read the table; a
 // rollback drops it (see SqliteStore::update).
@@ -24,6 +28,7 @@
 #include <cstdint>
 #include <memory>
 #include <unordered_map>
+#include <utility>
 
 #include "host/table/Database.h"
 
@@ -33,6 +38,9 @@ struct sqlite3_stmt;
 namespace quarvo::host {
 
 class SqliteStore;
+class SqliteStatements;
+class SqliteSchema;
+struct CiblesDeclencheurs;
 class CheckpointEnFond;
 
 class SqliteDatabase : public Database {
@@ -58,9 +66,23 @@ class SqliteDatabase : public Database {
   void rollback() override;
   int depth() const override { return depth_; }
 
+  // The rows of one read-only SQL query (tools and tests that read what the tables hold), each
+  // value as SQLite's text of it, NULL as empty text. `parametres` are bound to the query's
+  // parameters in order. Runs on this connection, inside its open transaction if any, after
+  // the updates the stores hold in memory are written. Throws UException when the text is not
+  // one query that only reads, or when SQLite refuses it.
+  std::vector<std::vector<std::string>> interroger(const std::string& sql,
+                                                   const std::vector<Valeur>& parametres = {});
+  // Copies of the log into the file done so far by the background thread.
+  int64_t checkpointsEnFond() const;
+
+ private:
+  // The raw connection is the store's alone: a read through it would miss the updates the
+  // stores hold in memory, a write would leave their memory stale.
+  friend class SqliteStore;
+  sqlite3* handle() { return db_.get(); }
   // A prepared statement from the cache, reset (its parameters keep their last bindings).
   sqlite3_stmt* prepare(const std::string& sql);
-  sqlite3* handle() { return db_; }
   [[noreturn]] void fail(const std::string& what);
   // Reads may be answered from what the stores remember: only inside a transaction, where no
   // other connection can change the file.
@@ -70,24 +92,35 @@ class SqliteDatabase : public Database {
   // dropped by a rollback.
   void noterEnAttente(SqliteStore* store);
   void ecrireEnAttente();
-  // Copies of the log into the file done so far by the background thread.
-  int64_t checkpointsEnFond() const;
+  // Forgets what the stores of the tables a trigger may write remember. REQUIRES: nothing
+  // held (ecrireEnAttente ran).
+  void oublierCibles(const CiblesDeclencheurs& cibles);
+  // Closes the connection when the database goes.
+  struct Fermeture {
+    void operator()(sqlite3* db) const;
+  };
 
- private:
-  std::filesystem::path path_;
-  sqlite3* db_ = nullptr;
   void executer(const std::string& sql);
   // Runs one cached statement that returns no rows.
   void pas(const std::string& sql);
   void oublierLectures();
+  // Drops the updates held and forgets every read: the work they belong to is undone.
+  void abandonnerMemoire();
+  // After a script, or when another connection committed: when the schema changed, every
+  // store learns its table's indexes and triggers again.
+  void verifierSchema();
   static int surCommit(void* self, sqlite3* db, const char* base, int pages);
 
+  std::filesystem::path path_;
+  std::unique_ptr<sqlite3, Fermeture> db_;  // before the members that use it: closed last
+  std::unique_ptr<SqliteStatements> statements_;
+  std::unique_ptr<SqliteSchema> schema_;
   int pagesCheckpoint_;
   std::unique_ptr<CheckpointEnFond> checkpoint_;  // started by the first commit that needs it
 
   int depth_ = 0;
   int64_t dataVersion_ = -1;
-  std::unordered_map<std::string, sqlite3_stmt*> statements_;
+  std::pair<int64_t, int64_t> versionSchema_{-1, -1};  // what the stores were described from
   std::unordered_map<std::string, std::unique_ptr<SqliteStore>> stores_;
   std::vector<SqliteStore*> enAttente_;  // stores holding updates not yet written
 };

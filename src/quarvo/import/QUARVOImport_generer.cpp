@@ -1,7 +1,6 @@
 #include "quarvo/import/QUARVOImport_generer.h"
 
 #include <algorithm>
-#include <cstdlib>
 
 #include "host/session/Session.h"
 #include "quarvo/frame/Appels.h"
@@ -14,26 +13,6 @@ namespace quarvo {
 using namespace host;
 using Montants = DifferencesGeneration::Montants;
 using Solde = DifferencesGeneration::Solde;
-
-namespace {
-
-// Fault injection for the crash tests: with QUARVO_FAIL_AFTER_PIECES=N the process dies in the
-// middle of the piece that follows the N-th piece written, before that piece commits. The count
-// starts again whenever the variable changes (a test's child process sets it after forking).
-int64_t piecesEcrites = 0;
-
-int64_t limitePieces() {
-  static std::string vu;
-  const char* text = std::getenv("QUARVO_FAIL_AFTER_PIECES");
-  std::string valeur = text != nullptr ? text : "";
-  if (valeur != vu) {
-    vu = valeur;
-    piecesEcrites = 0;
-  }
-  return valeur.empty() ? int64_t{-1} : import::enNombre(valeur);
-}
-
-}  // namespace
 
 QUARVOImport_generer::QUARVOImport_generer(Evt* evt, const DifferencesGeneration& kind)
     : Parcours(evt),
@@ -73,7 +52,6 @@ QUARVOImport_generer::QUARVOImport_generer(Evt* evt, const DifferencesGeneration
       iAfaffa_(this, "VOVOVA", "I_AFAFFA", ""),
       iAfpres_(this, "VOVOVA", "I_AFPRES", "") {
   lierParametres(evt, {{&pErreur_, 1}});
-  limite_ = limitePieces();
   nomBase("VOVOVA");
   nomTable(kind_.staging);
   plan({"NUMERO_DOC"}, "NUMERO_DOC");
@@ -147,10 +125,7 @@ void QUARVOImport_generer::debut(Evt* evt) {
     vCritereAchat_.assign(iAfpara_.valeur("PARAM1"));
   }
 
-  // Under fault injection every piece is committed on its own, so that the pieces before the
-  // crash are on disk and the crash falls in the middle of a piece, the case to prove.
-  lot_ = limite_ >= 0 ? std::make_unique<TransactionsGroupees>(session().db(), 1)
-                      : std::make_unique<TransactionsGroupees>(session().db());
+  lot_ = std::make_unique<TransactionsGroupees>(session().db());
   EvtParamRef generation{ref(vCodePartage_), val("U")};
   generationOuverte_ = protocole("DEBUT_GENERATION", generation);
 
@@ -295,7 +270,6 @@ void QUARVOImport_generer::pour_tout(Evt*) {
   }
   ++rang_;
   if (kind_.majLigne) appelerProcedure("", "", "", "MAJ_LIGNE", &none, 0);
-  if (limite_ >= 0 && piecesEcrites >= limite_) std::_Exit(75);
   jauge();
 }
 
@@ -580,7 +554,6 @@ void QUARVOImport_generer::fin1(Evt*) {
   if (piece_) {
     piece_->commit();
     piece_.reset();
-    ++piecesEcrites;
   }
 }
 

@@ -173,7 +173,6 @@ class QUARVOImport_generer : public host::Parcours {
   std::string regime_;
   int64_t saisieAna_ = 0;
   int64_t pasJauge_ = 1;
-  int64_t limite_ = -1;      // see QUARVO_FAIL_AFTER_PIECES
   bool receptions_ = false;  // the company books goods received ("OPTION9" "O")
   int64_t rang_ = 0;         // lines copied into the current piece
   std::vector<LienAReporter> liens_;

@@ -2,11 +2,11 @@
 // and generation run by name as the import window runs them, and SQL reads of the results.
 #pragma once
 
-#include <sqlite3.h>
-
 #include <fstream>
 #include <string>
+#include <vector>
 
+#include "host/UException.h"
 #include "host/automate/Automate.h"
 #include "support/TestSession.h"
 
@@ -20,21 +20,21 @@ inline std::filesystem::path ecrireFichier(TestSession& t, const std::string& na
   return path;
 }
 
-// Rows of a query, columns joined by '|', one row per line.
+// Rows of a query, columns joined by '|', one row per line, NULL as empty. It runs on the
+// test's connection, inside its transaction if one is open, and sees the updates the store
+// holds in memory.
 inline std::string requete(TestSession& t, const std::string& sql) {
-  sqlite3_stmt* st = nullptr;
-  if (sqlite3_prepare_v2(t.db().handle(), sql.c_str(), -1, &st, nullptr) != SQLITE_OK) {
-    return std::string("SQL error: ") + sqlite3_errmsg(t.db().handle());
+  std::vector<std::vector<std::string>> lignes;
+  try {
+    lignes = t.db().interroger(sql);
+  } catch (const host::UException& e) {
+    return std::string("SQL error: ") + e.what();
   }
   std::string out;
-  while (sqlite3_step(st) == SQLITE_ROW) {
-    for (int i = 0; i < sqlite3_column_count(st); ++i) {
-      const unsigned char* v = sqlite3_column_text(st, i);
-      out += (i ? "|" : "") + std::string(v ? reinterpret_cast<const char*>(v) : "");
-    }
+  for (const auto& ligne : lignes) {
+    for (size_t i = 0; i < ligne.size(); ++i) out += (i ? "|" : "") + ligne[i];
     out += "\n";
   }
-  sqlite3_finalize(st);
   return out;
 }
 
