@@ -34,6 +34,7 @@ namespace {
 
 struct Options {
   std::string db = "quarvo.db";
+  int wait = 30;  // seconds a command waits for another program's lock on the database
   std::string company = "DEMO";
   std::string user = "demo";
   std::vector<std::string> answers;
@@ -316,6 +317,7 @@ int executer(const Commande& commande, const Options& o, std::ostream& out, std:
   if (commande.base == Commande::Base::Aucune) return commande.executer(contexte);
   std::unique_ptr<Workspace> ws =
       commande.base == Commande::Base::Creee ? Workspace::init(o.db) : Workspace::open(o.db);
+  ws->db().delaiAttente(std::chrono::seconds(o.wait));
   Session& session = ws->startSession(ui, o.company, o.user);
   Session::Scope scope(session);
   if (commande.societe) {
@@ -339,6 +341,10 @@ int runCommandLine(int argc, char** argv, std::ostream& out, std::ostream& err) 
   cli.add_option("--db", o.db, "Database file")->capture_default_str();
   cli.add_option("--company", o.company, "Company code of the session")->capture_default_str();
   cli.add_option("--user", o.user, "User of the session")->capture_default_str();
+  cli.add_option("--wait", o.wait,
+                 "Seconds to wait for another program's lock on the database before giving up")
+      ->capture_default_str()
+      ->check(CLI::NonNegativeNumber);
   cli.add_option("--answer", o.answers,
                  "Answer to the next dialog: a button's number or its text; repeat in order. A "
                  "dialog without an answer, or whose answer names no button, is refused");
@@ -366,7 +372,8 @@ int runCommandLine(int argc, char** argv, std::ostream& out, std::ostream& err) 
   // A word where the command is expected that names no command is named back.
   for (int i = 1; i < argc; ++i) {
     std::string word = argv[i];
-    if (word == "--db" || word == "--company" || word == "--user" || word == "--answer") {
+    if (word == "--db" || word == "--company" || word == "--user" || word == "--answer" ||
+        word == "--wait") {
       ++i;
       continue;
     }

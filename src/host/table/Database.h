@@ -38,7 +38,13 @@ class Transaction {
  public:
   explicit Transaction(Database& db) : db_(db) { db_.begin(); }
   ~Transaction() {
-    if (!done_) db_.rollback();
+    if (done_) return;
+    try {
+      db_.rollback();
+    } catch (...) {
+      // Unwinding from a fault: the connection's own rollback (on close or on its next
+      // statement) undoes what this one could not.
+    }
   }
   Transaction(const Transaction&) = delete;
   Transaction& operator=(const Transaction&) = delete;

@@ -197,12 +197,16 @@ void SqliteDatabase::execScript(const std::string& sql) {
   verifierSchema();
 }
 
+void SqliteDatabase::delaiAttente(std::chrono::milliseconds delai) {
+  sqlite3_busy_timeout(db_.get(), static_cast<int>(delai.count()));
+}
+
 void SqliteDatabase::executer(const std::string& sql) {
   char* err = nullptr;
-  if (sqlite3_exec(db_.get(), sql.c_str(), nullptr, nullptr, &err) != SQLITE_OK) {
-    std::string msg = err ? err : "unknown error";
+  int rc = sqlite3_exec(db_.get(), sql.c_str(), nullptr, nullptr, &err);
+  if (rc != SQLITE_OK) {
     sqlite3_free(err);
-    throw UException("database script failed: " + msg);
+    echecSqlite(db_.get(), sqlite3_extended_errcode(db_.get()), "database script");
   }
 }
 

@@ -25,6 +25,7 @@
 // CheckpointEnFond), so that a long batch does not wait for those copies and their syncs.
 #pragma once
 
+#include <chrono>
 #include <cstdint>
 #include <memory>
 #include <unordered_map>
@@ -65,6 +66,8 @@ class SqliteDatabase : public Database {
   void commit() override;
   void rollback() override;
   int depth() const override { return depth_; }
+  // How long a statement waits for another connection's lock before it fails (30 s unless set).
+  void delaiAttente(std::chrono::milliseconds delai);
 
   // The rows of one read-only SQL query (tools and tests that read what the tables hold), each
   // value as SQLite's text of it, NULL as empty text. `parametres` are bound to the query's

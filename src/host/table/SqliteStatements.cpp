@@ -18,8 +18,27 @@ void SqliteStatements::finaliser() {
   statements_.clear();
 }
 
+void echecSqlite(sqlite3* db, int rc, const std::string& what) {
+  std::string detail = what + ": " + (db != nullptr ? sqlite3_errmsg(db) : sqlite3_errstr(rc));
+  switch (rc & 0xff) {
+    case SQLITE_BUSY:
+    case SQLITE_LOCKED:
+    case SQLITE_READONLY:
+    case SQLITE_FULL:
+    case SQLITE_IOERR:
+    case SQLITE_CANTOPEN:
+    case SQLITE_PERM:
+    case SQLITE_CORRUPT:
+    case SQLITE_NOTADB:
+    case SQLITE_PROTOCOL:
+      throw BaseIndisponible("the database cannot be written (" + detail + ")");
+    default:
+      throw UException(detail);
+  }
+}
+
 void SqliteStatements::fail(const std::string& what) const {
-  throw UException(what + ": " + sqlite3_errmsg(db_));
+  echecSqlite(db_, sqlite3_extended_errcode(db_), what);
 }
 
 std::string sqlIdent(const std::string& identifier) {

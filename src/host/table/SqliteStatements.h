@@ -62,6 +62,11 @@ struct Finaliser {
 };
 
 // An identifier quoted for SQL text ("NAME", with inner quotes doubled).
+// Throws the runtime fault for SQLite's result `rc` on `db`: BaseIndisponible when the database
+// cannot be used at all (locked past the wait, read-only, full, failing, not a database), a plain
+// UException otherwise. `what` names the statement.
+[[noreturn]] void echecSqlite(sqlite3* db, int rc, const std::string& what);
+
 std::string sqlIdent(const std::string& identifier);
 
 // A value as its column kind stores it: amounts and dates become their canonical text.
