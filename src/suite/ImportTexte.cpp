@@ -315,10 +315,8 @@ ResultatChargement ImportTexte::charger(Session& session, const std::string& tab
     colonnes.push_back(*i);
   }
   if (fautesEntete > kErreursMax) {
-    r.erreurs.push_back({1, "", "",
-                         "et " + std::to_string(fautesEntete - kErreursMax) +
-                             " autres colonnes refusées : la lecture s'arrête",
-                         ""});
+    r.erreurs.back().motif += " (et " + std::to_string(fautesEntete - kErreursMax) +
+                              " autres colonnes refusées)";
   }
   if (r.erreurs.empty()) {
     for (const char* requise : colonnesRequises(table)) {
