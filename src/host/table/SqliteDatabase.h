@@ -81,9 +81,9 @@ class SqliteDatabase : public Database {
 
  private:
   // The raw connection is the store's alone: a read through it would miss the updates the
-  // stores hold in memory, a write would leave their memory stale.
+  // stores hold in memory, a write would leave their memory stale. The table stores reach it
+  // through the statements they are given, and the services below through friendship.
   friend class SqliteStore;
-  sqlite3* handle() { return db_.get(); }
   // A prepared statement from the cache, reset (its parameters keep their last bindings).
   sqlite3_stmt* prepare(const std::string& sql);
   [[noreturn]] void fail(const std::string& what);
