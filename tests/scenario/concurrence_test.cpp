@@ -68,41 +68,12 @@ void sql(const fs::path& db, const std::string& script) {
   sqlite3_close(h);
 }
 
-class ConcurrenceTest : public ::testing::Test {
- protected:
-  void SetUp() override {
-    std::random_device rd;
-    dir_ = fs::temp_directory_path() / ("quarvo-concurrence-" + std::to_string(rd()));
-    fs::create_directories(dir_);
-  }
-  void TearDown() override {
-    if (HasFailure()) {
-      std::printf("databases kept in %s\n", dir_.c_str());
-    } else {
-      fs::remove_all(dir_);
-    }
-  }
-  // The starting database, built by running quarvo with each of `commandes`.
-  void preparer(const std::vector<std::vector<std::string>>& commandes) {
-    for (const auto& args : commandes) {
-      ASSERT_EQ(executer(dir_ / "depart.db", args, dir_ / "depart.txt"), 0)
-          << lire(dir_ / "depart.txt");
-    }
-  }
-  // A folder with a fresh copy of the starting database and of `fichiers`.
-  fs::path copie(const std::string& nom, const std::vector<std::string>& fichiers = {}) {
-    fs::path d = dir_ / nom;
-    fs::remove_all(d);
-    fs::create_directories(d);
-    fs::copy_file(dir_ / "depart.db", d / "q.db");
-    for (const auto& f : fichiers) fs::copy_file(dir_ / f, d / f);
-    return d;
-  }
-  fs::path dir_;
-};
+using ConcurrenceTest = EssaiProgramme;
 
 TEST_F(ConcurrenceTest, TwoImputationsStartedTogetherLinkEveryPieceOnce) {
-  preparer({{"init", "--demo"}, {"gen", "--projects", "20", "--pieces", "300", "--lines", "3"}});
+  preparer(
+      {{"init", "--demo"},
+       {"gen", "--projects", "20", "--pieces", std::to_string(300 / kReduction), "--lines", "3"}});
   fs::path ref = copie("seul");
   ASSERT_EQ(executer(ref / "q.db", {"impute"}, ref / "journal.txt"), 0);
   const auto attendu = resultat(ref / "q.db");
@@ -125,8 +96,10 @@ TEST_F(ConcurrenceTest, TwoImputationsStartedTogetherLinkEveryPieceOnce) {
 }
 
 TEST_F(ConcurrenceTest, AnImportBesideAnImputationDoublesNothing) {
-  preparer({{"init", "--demo"}, {"gen", "--projects", "20", "--pieces", "200", "--lines", "3"}});
-  std::ofstream(dir_ / "cf.txt", std::ios::binary) << fichierCommandes(150);
+  preparer(
+      {{"init", "--demo"},
+       {"gen", "--projects", "20", "--pieces", std::to_string(200 / kReduction), "--lines", "3"}});
+  std::ofstream(dir_ / "cf.txt", std::ios::binary) << fichierCommandes(150 / kReduction);
   fs::path ref = copie("seul", {"cf.txt"});
   ASSERT_EQ(executer(ref / "q.db", {"import", "--cf", (ref / "cf.txt").string()}, ref / "i.txt"), 0)
       << lire(ref / "i.txt");

@@ -42,41 +42,10 @@ struct Travail {
   std::string travailFait;
 };
 
-class CrashTest : public ::testing::Test {
+class CrashTest : public EssaiProgramme {
  protected:
-  void SetUp() override {
-    std::random_device rd;
-    dir_ = fs::temp_directory_path() / ("quarvo-crash-" + std::to_string(rd()));
-    fs::create_directories(dir_);
-  }
-  void TearDown() override {
-    // A failed run keeps its databases for a look.
-    if (HasFailure()) {
-      std::printf("databases kept in %s\n", dir_.c_str());
-    } else {
-      fs::remove_all(dir_);
-    }
-  }
-
-  // Runs quarvo on the starting database `depart` (which it builds); fails on a non-zero exit.
-  void preparer(const std::vector<std::vector<std::string>>& commandes) {
-    for (const auto& args : commandes) {
-      ASSERT_EQ(executer(dir_ / "depart.db", args, dir_ / "depart.txt"), 0)
-          << lire(dir_ / "depart.txt");
-    }
-  }
-
-  // A folder holding a fresh copy of the starting database and of the job's input files.
   fs::path copie(const std::string& nom, const Travail& travail) {
-    fs::path dossier = dir_ / nom;
-    fs::remove_all(dossier);
-    fs::create_directories(dossier);
-    fs::copy_file(dir_ / "depart.db", dossier / "q.db");
-    if (fs::exists(dir_ / "depart.db-wal")) {
-      fs::copy_file(dir_ / "depart.db-wal", dossier / "q.db-wal");
-    }
-    for (const auto& f : travail.fichiers) fs::copy_file(dir_ / f, dossier / f);
-    return dossier;
+    return EssaiProgramme::copie(nom, travail.fichiers);
   }
 
   // The job run once uninterrupted, then killed at `points` moments spread over that run's
@@ -198,24 +167,7 @@ class CrashTest : public ::testing::Test {
                     "SELECT COUNT(*) FROM QUARVO"};
     tuerEtReprendre(travail, points);
   }
-
-  fs::path dir_;
 };
-
-// The sanitizer build (unoptimised, with address and undefined-behaviour checks) runs the
-// program some forty times slower: there the short cases kill it as often on a twentieth of the
-// data.
-#if defined(__SANITIZE_ADDRESS__)
-constexpr int kReduction = 20;
-#elif defined(__has_feature)
-#if __has_feature(address_sanitizer)
-constexpr int kReduction = 20;
-#else
-constexpr int kReduction = 1;
-#endif
-#else
-constexpr int kReduction = 1;
-#endif
 
 TEST_F(CrashTest, AnImportKilledAnywhereAndRerunEndsAsOneUninterruptedRun) {
   importer(1000 / kReduction, 25);

@@ -8,8 +8,10 @@
 
 #include <algorithm>
 #include <cerrno>
+#include <cstdio>
 #include <fstream>
 #include <iterator>
+#include <random>
 #include <thread>
 
 extern char** environ;
@@ -149,6 +151,44 @@ std::string premieres(const std::vector<std::string>& rows, size_t n) {
   for (size_t i = 0; i < rows.size() && i < n; ++i) out += rows[i] + "\n";
   if (rows.size() > n) out += "... " + std::to_string(rows.size() - n) + " more\n";
   return out;
+}
+
+void EssaiProgramme::SetUp() {
+  std::random_device rd;
+  dir_ =
+      fs::temp_directory_path() /
+      ("quarvo-" +
+       std::string(::testing::UnitTest::GetInstance()->current_test_info()->name()).substr(0, 24) +
+       "-" + std::to_string(rd()));
+  fs::create_directories(dir_);
+}
+
+void EssaiProgramme::TearDown() {
+  // A failed run keeps its databases for a look.
+  if (HasFailure()) {
+    std::printf("databases kept in %s\n", dir_.c_str());
+  } else {
+    fs::remove_all(dir_);
+  }
+}
+
+void EssaiProgramme::preparer(const std::vector<std::vector<std::string>>& commandes) {
+  for (const auto& args : commandes) {
+    ASSERT_EQ(executer(dir_ / "depart.db", args, dir_ / "depart.txt"), 0)
+        << lire(dir_ / "depart.txt");
+  }
+}
+
+fs::path EssaiProgramme::copie(const std::string& nom, const std::vector<std::string>& fichiers) {
+  fs::path dossier = dir_ / nom;
+  fs::remove_all(dossier);
+  fs::create_directories(dossier);
+  fs::copy_file(dir_ / "depart.db", dossier / "q.db");
+  if (fs::exists(dir_ / "depart.db-wal")) {
+    fs::copy_file(dir_ / "depart.db-wal", dossier / "q.db-wal");
+  }
+  for (const auto& f : fichiers) fs::copy_file(dir_ / f, dossier / f);
+  return dossier;
 }
 
 std::string fichierCommandes(int pieces) {

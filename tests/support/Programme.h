@@ -2,6 +2,7 @@
 // when a test says so, and what a database holds read back with SQLite itself once they ended.
 #pragma once
 
+#include <gtest/gtest.h>
 #include <sqlite3.h>
 #include <sys/types.h>
 
@@ -16,6 +17,20 @@ namespace quarvo::test {
 
 namespace fs = std::filesystem;
 using Clock = std::chrono::steady_clock;
+
+// The sanitizer build (unoptimised, with address and undefined-behaviour checks) runs the
+// program some forty times slower: there tests on the program run on a twentieth of the data.
+#if defined(__SANITIZE_ADDRESS__)
+inline constexpr int kReduction = 20;
+#elif defined(__has_feature)
+#if __has_feature(address_sanitizer)
+inline constexpr int kReduction = 20;
+#else
+inline constexpr int kReduction = 1;
+#endif
+#else
+inline constexpr int kReduction = 1;
+#endif
 
 // Starts `quarvo --db DB ARGS...` with its output (stdout and stderr) in `journal`; -1 on failure.
 // `devant` is a command that runs the program (runuser and its words), when one is given.
@@ -114,5 +129,20 @@ std::string premieres(const std::vector<std::string>& rows, size_t n = 12);
 // also order an article of another one (a new article-supplier row), and the services of some
 // lines have no line yet in their budget (a new budget line).
 std::string fichierCommandes(int pieces);
+
+// A test on the program: a folder of its own (kept when the test fails, for a look), a
+// starting database built there by running commands, and fresh copies of it for each run.
+class EssaiProgramme : public ::testing::Test {
+ protected:
+  void SetUp() override;
+  void TearDown() override;
+  // Runs quarvo on the starting database "depart.db" (which it builds); fails on a non-zero
+  // exit.
+  void preparer(const std::vector<std::vector<std::string>>& commandes);
+  // A folder `nom` holding a fresh copy of the starting database (as "q.db") and of `fichiers`.
+  fs::path copie(const std::string& nom, const std::vector<std::string>& fichiers = {});
+
+  fs::path dir_;
+};
 
 }  // namespace quarvo::test
