@@ -185,16 +185,6 @@ std::vector<const char*> colonnesRequises(const std::string& table) {
   return {"NUMERO_DOC", "DATE_CREATION", "FOURNISSEUR", "ARTICLE", "QTE", "PUHT"};
 }
 
-// A purchase line's amount must be an amount: QTE × PUHT within the money type's range.
-bool montantRepresentable(Table& ligne) {
-  try {
-    (void)(toMonnaie(ligne.valeur("PUHT")) * Monnaie::fromDouble(toDouble(ligne.valeur("QTE"))));
-    return true;
-  } catch (const std::exception&) {
-    return false;
-  }
-}
-
 std::string attendu(ColKind kind) {
   switch (kind) {
     case ColKind::Date:
@@ -292,8 +282,6 @@ ResultatChargement ImportTexte::charger(Session& session, const std::string& tab
   std::vector<size_t> colonnes;
   std::set<std::string> vues;
   size_t colPiece = SIZE_MAX;
-  size_t colPrix = SIZE_MAX;
-  const bool achat = table.rfind("IMM_PIECE_", 0) == 0;
   // The header's faults are bounded like the lines': past kErreursMax, they are only counted.
   size_t fautesEntete = 0;
   auto fauteEntete = [&](ErreurChargement e) {
@@ -311,12 +299,11 @@ ResultatChargement ImportTexte::charger(Session& session, const std::string& tab
       continue;
     }
     if (name == "NUMERO_DOC") colPiece = colonnes.size();
-    if (name == "PUHT") colPrix = colonnes.size();
     colonnes.push_back(*i);
   }
   if (fautesEntete > kErreursMax) {
-    r.erreurs.back().motif += " (et " + std::to_string(fautesEntete - kErreursMax) +
-                              " autres colonnes refusées)";
+    r.erreurs.back().motif +=
+        " (et " + std::to_string(fautesEntete - kErreursMax) + " autres colonnes refusées)";
   }
   if (r.erreurs.empty()) {
     for (const char* requise : colonnesRequises(table)) {
@@ -362,11 +349,6 @@ ResultatChargement ImportTexte::charger(Session& session, const std::string& tab
           noter({no, col.name, cells[k], attendu(col.kind), piece});
           saine = false;
         }
-      }
-      if (saine && achat && !montantRepresentable(staging)) {
-        std::string prix = colPrix < cells.size() ? cells[colPrix] : std::string();
-        noter({no, "PUHT", prix, "montant de la ligne (QTE × PUHT) hors limites", piece});
-        saine = false;
       }
       staging.ecrire("LIGNE_FICHIER", Valeur::entier(static_cast<int64_t>(no)));
       // Numbered here in file order (the table was just emptied), rather than by the table's

@@ -92,3 +92,28 @@ TEST(ImportCommandTest, DemoFilesAreControlledThenImportedWithTheirErrorsListed)
 
 }  // namespace
 }  // namespace quarvo
+
+namespace quarvo {
+namespace {
+
+TEST(ImportCommandTest, ALineWhoseAmountIsOutOfRangeRefusesItsPieceOnly) {
+  test::TestSession t(true);
+  std::string file =
+      test::enteteAutre() +
+      test::ligne({"CF26800001", "05/12/2026", "ELECDIS", "AFF001", "BU26-0001", "CABLE-3G2.5", "",
+                   "2", "180", "0", "20", "", "", "", "0"}) +
+      test::ligne({"CF26800002", "05/12/2026", "ELECDIS", "AFF001", "BU26-0001", "CABLE-3G2.5", "",
+                   "1000000000", "10000000", "0", "20", "", "", "", "0"});
+  app::ImportOptions o;
+  o.cf = test::ecrireFichier(t, "cf.txt", file).string();
+  std::ostringstream out;
+  EXPECT_EQ(app::runImport(t.session(), o, out), 1);
+  EXPECT_EQ(test::requete(t, R"(SELECT NUMERO_DOC FROM "GAPECOM" WHERE IDENT > '0000001000')"),
+            "CF26800001\n");
+  EXPECT_EQ(test::requete(t, R"(SELECT CODE, CMT FROM "IMM_ERREUR")"),
+            "CF26800002|Ligne 3, colonne PUHT, valeur 10000000.00 : montant de la ligne (QTE × "
+            "PUHT) hors limites\n");
+}
+
+}  // namespace
+}  // namespace quarvo

@@ -2,6 +2,8 @@
 
 #include <gtest/gtest.h>
 
+#include <stdexcept>
+
 #include "host/automate/Interface2.h"
 #include "host/automate/Parcours.h"
 #include "host/automate/Registry.h"
@@ -23,6 +25,8 @@ class Probe : public Traitmnt {
     addBranch("TRANSFORMER(3,4)",
               [this](Evt* e) { log += "T" + std::to_string(e->numero()) + ";"; });
     addBranch("VALIDER_PIECE", [](Evt*) { throw UException("disk full"); });
+    addBranch("CALCULER", [](Evt*) { throw std::overflow_error("amount out of range"); });
+    addBranch("ECRIRE", [](Evt*) { throw BaseIndisponible("the database cannot be written"); });
     addBranch("ECHOUER", [this](Evt* e) { erreurMethode(1, e); });
     addBranch("APPELS", [this](Evt* e) {
       appelerProcedure("", "", "", "ECHOUER", nullptr, 0);
@@ -103,6 +107,14 @@ TEST(AutomateTest, DispatchRunsOverridesNumberedLabelsAndGuardsExceptions) {
   EXPECT_EQ(d.log, "exception:VALIDER_PIECE:disk full;");
   EXPECT_FALSE(d.termine());  // the automaton stays alive
   EXPECT_NE(t.ui().transcriptText().find("INCIDENT"), std::string::npos);
+  // Any exception a handler lets out is the runtime's fault, reported with the label; one that
+  // says the database cannot be written goes through to the command.
+  d.log.clear();
+  EvtParamVal calcul;
+  EXPECT_TRUE(d.raise("CALCULER", &calcul));
+  EXPECT_EQ(d.log, "exception:CALCULER:amount out of range;");
+  EXPECT_EQ(calcul.erreur(), 1);
+  EXPECT_THROW(d.raise("ECRIRE", &calcul), BaseIndisponible);
 }
 
 TEST(AutomateTest, OwnProcedureOutcomesAreReadAfterTheCall) {

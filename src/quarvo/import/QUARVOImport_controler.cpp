@@ -176,6 +176,15 @@ void QUARVOImport_controler::pour_tout(Evt*) {
     if (!trouve) erreur("Taux de TVA <" + taux.toChaine() + "> inexistant");
   }
 
+  // The line's amount must be one: QTE × PUHT within the range of amounts. Such a line could
+  // not be generated; its piece is refused here, naming where, and the others go on.
+  try {
+    (void)(toMonnaie(row.valeur("PUHT")) * Monnaie::fromDouble(toDouble(row.valeur("QTE"))));
+  } catch (const std::exception&) {
+    erreur("Ligne " + staged("LIGNE_FICHIER") + ", colonne PUHT, valeur " + staged("PUHT") +
+           " : montant de la ligne (QTE × PUHT) hors limites");
+  }
+
   // 7. Invoices: a line that is not valid also stages its credit-note line. A faulty line
   // stages nothing: its piece is refused as a whole.
   if (staging2_ && !ligneEnErreur_ && toEntier(row.valeur("VALIDE")) != 1 &&
