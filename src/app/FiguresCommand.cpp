@@ -3,7 +3,6 @@
 #include <fmt/format.h>
 
 #include <cmath>
-#include <cstdint>
 #include <map>
 #include <ostream>
 #include <vector>
@@ -14,6 +13,7 @@
 #include "host/table/Champ.h"
 #include "host/table/Database.h"
 #include "quarvo/frame/Apports.h"
+#include "quarvo/frame/PieceKinds.h"
 
 namespace quarvo::app {
 
@@ -96,37 +96,41 @@ struct PieceLiee {
   Monnaie ht;
 };
 
-// What the piece's lines hold: quantities and net amounts, by absolute value, whatever was
-// settled since. nullopt when the piece does not exist.
-std::optional<std::pair<double, Monnaie>> contenuPiece(Session& s, const std::string& table,
-                                                       const std::string& ident) {
-  if (s.db().store(table) == nullptr) return std::nullopt;
-  Table entete(nullptr, table == "AFEFFO" ? "VOVOVA" : "GESCOM", table, "AUDIT_PIECE");
-  if (entete.chercher(3, "IDENT", '=', Valeur::chaine(ident)) != 0) return std::nullopt;
-  std::string tableLignes = "GAPL" + table.substr(std::min<size_t>(4, table.size()));
-  if (table == "AFEFFO" || s.db().store(tableLignes) == nullptr) {
-    return std::pair<double, Monnaie>{1e300, Monnaie::fromMicros(INT64_MAX)};  // no bound known
-  }
-  auto colonneEntete = [&entete](const std::string& c) { return entete.valeur(c); };
-  frame::EnteteAchat e = frame::enteteAchat(table, colonneEntete);
-  Table lignes(nullptr, "GESCOM", tableLignes, "AUDIT_LIGNES");
-  lignes.chercher(3, "NUMERO", '/', Valeur::chaine(ident + "|"));
-  lignes.ouvrir();
-  auto colonneLigne = [&lignes](const std::string& c) { return lignes.valeur(c); };
+// What the piece holds.
+struct Contenu {
+  bool borne = false;  // purchasing pieces only: a time entry's lines are no purchase lines
   double qte = 0;
   Monnaie ht;
+};
+
+// What the piece's lines hold: quantities and net amounts, by absolute value, whatever was
+// settled since. nullopt when the piece does not exist.
+std::optional<Contenu> contenuPiece(const std::string& table, const std::string& ident) {
+  const frame::PieceKind* kind = frame::kindOfTable(table);
+  if (kind == nullptr) return std::nullopt;
+  Table entete(nullptr, kind->code.empty() ? "VOVOVA" : "GESCOM", table, "AUDIT_PIECE");
+  if (entete.chercher(3, "IDENT", '=', Valeur::chaine(ident)) != 0) return std::nullopt;
+  Contenu c;
+  if (kind->code.empty()) return c;
+  c.borne = true;
+  auto colonneEntete = [&entete](const std::string& col) { return entete.valeur(col); };
+  frame::EnteteAchat e = frame::enteteAchat(table, colonneEntete);
+  Table lignes(nullptr, "GESCOM", std::string(kind->lines), "AUDIT_LIGNES");
+  lignes.chercher(3, "NUMERO", '/', Valeur::chaine(ident + "|"));
+  lignes.ouvrir();
+  auto colonneLigne = [&lignes](const std::string& col) { return lignes.valeur(col); };
   while (lignes.lire(1) == 0) {
     frame::LigneAchat l = frame::ligneAchat(colonneLigne);
     l.qteSoldee = 0;
     frame::ApportLigne a = frame::apportLigne(e, l);
-    qte += std::abs(a.qte);
-    ht += a.ht.abs();
+    c.qte += std::abs(a.qte);
+    c.ht += a.ht.abs();
   }
-  return std::pair<double, Monnaie>{qte, ht};
+  return c;
 }
 
 // Link rows that name no piece, and pieces linked beyond what they hold.
-std::vector<TextRow> liensSansPiece(Session& s) {
+std::vector<TextRow> liensSansPiece() {
   std::map<std::pair<std::string, std::string>, PieceLiee> pieces;
   Table liens(nullptr, "VOVOVA", "QUARVO", "AUDIT_LIENS");
   liens.ouvrir();
@@ -142,19 +146,19 @@ std::vector<TextRow> liensSansPiece(Session& s) {
   }
   std::vector<TextRow> rows;
   for (const auto& [key, p] : pieces) {
-    auto contenu = contenuPiece(s, p.table, p.ident);
+    auto contenu = contenuPiece(p.table, p.ident);
     std::string piece = p.table + " " + p.ident + " (" + p.numero + ")";
     if (!contenu) {
       rows.push_back({piece, "linked, but the piece does not exist", "", ""});
       continue;
     }
-    const auto& [qte, ht] = *contenu;
-    if (p.qte > qte + 1e-9) {
+    if (!contenu->borne) continue;
+    if (p.qte > contenu->qte + 1e-9) {
       rows.push_back({piece, "quantity linked beyond the piece's", fmt::format("{}", p.qte),
-                      fmt::format("{}", qte)});
+                      fmt::format("{}", contenu->qte)});
     }
-    if (p.ht > ht) {
-      rows.push_back({piece, "amount linked beyond the piece's", p.ht.text(), ht.text()});
+    if (p.ht > contenu->ht) {
+      rows.push_back({piece, "amount linked beyond the piece's", p.ht.text(), contenu->ht.text()});
     }
   }
   return rows;
@@ -178,7 +182,7 @@ int runCheck(Session& s, const std::optional<std::string>& only, bool fix, std::
     }
   }
   // The links against their pieces, for the whole database (a link may be wrong on any line).
-  std::vector<TextRow> pieces = only ? std::vector<TextRow>{} : liensSansPiece(s);
+  std::vector<TextRow> pieces = only ? std::vector<TextRow>{} : liensSansPiece();
   if (drifting.empty() && pieces.empty()) {
     out << "Every budget line checked matches its links.\n";
     return 0;

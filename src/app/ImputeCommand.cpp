@@ -42,6 +42,7 @@ struct Bilan {
   int64_t imputables = 0;
   int64_t ecrites = 0;
   int64_t dejaLiees = 0;
+  int64_t nonEcrites = 0;  // imputable, and not written: the database refused it
   int64_t liens = 0;
   Monnaie montant;
 };
@@ -56,6 +57,7 @@ Bilan bilan() {
     std::string ecriture = pieces.valeur("ECRITURE").toChaine();
     if (ecriture == "ECRITE") ++b.ecrites;
     if (ecriture == "DEJA_LIEE") ++b.dejaLiees;
+    if (ecriture.empty() && pieces.valeur("IMPUTATION").toChaine() == "O") ++b.nonEcrites;
     b.liens += toEntier(pieces.valeur("LIENS_CREES"));
     b.montant += toMonnaie(pieces.valeur("HT_LIE"));
   }
@@ -93,34 +95,6 @@ void printProposal(std::ostream& out) {
     }
   }
 }
-
-int imputer(Session& s, const ImputeOptions& o, std::ostream& out);
-
-// The pieces the writer had to write and did not: the database refused it.
-int64_t nonEcrites() {
-  Table pieces(nullptr, "VOVOVA", "M_EAPPR", "RESUME");
-  pieces.ouvrir();
-  int64_t n = 0;
-  while (pieces.lire(1) == 0) {
-    if (pieces.valeur("IMPUTATION").toChaine() == "O" &&
-        pieces.valeur("ECRITURE").toChaine().empty())
-      ++n;
-  }
-  return n;
-}
-
-}  // namespace
-
-int runImpute(Session& s, const ImputeOptions& o, std::ostream& out) {
-  try {
-    return imputer(s, o, out);
-  } catch (const BaseIndisponible&) {
-    out << "Pieces not written: " << nonEcrites() << "\n";
-    throw;
-  }
-}
-
-namespace {
 
 int imputer(Session& s, const ImputeOptions& o, std::ostream& out) {
   Session::Scope scope(s);
@@ -174,5 +148,14 @@ int imputer(Session& s, const ImputeOptions& o, std::ostream& out) {
 }
 
 }  // namespace
+
+int runImpute(Session& s, const ImputeOptions& o, std::ostream& out) {
+  try {
+    return imputer(s, o, out);
+  } catch (const BaseIndisponible&) {
+    out << "Pieces not written: " << bilan().nonEcrites << "\n";
+    throw;
+  }
+}
 
 }  // namespace quarvo::app

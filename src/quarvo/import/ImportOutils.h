@@ -1,12 +1,11 @@
-// Small text helpers shared by the import automata: numbers read from text, characters of a text
-// counted as characters (not bytes), the company's current month.
+// Small helpers shared by the import automata: numbers read from text, the company's current
+// month. (Characters of a text are counted by the runtime's host/Texte.h.)
 #pragma once
 
 #include <charconv>
 #include <cstdint>
 #include <string>
 
-#include "host/Texte.h"
 #include "host/value/Date.h"
 
 namespace quarvo::import {
@@ -16,10 +15,6 @@ inline int64_t enNombre(const std::string& text) {
   std::from_chars(text.data(), text.data() + text.size(), n);
   return n;
 }
-
-// Characters of a text, counted as characters (the runtime's rule).
-using host::caracteres;
-using host::derniersCaracteres;
 
 // Last day of the month of a "mmyyyy" period ("122026" gives 31/12/2026); empty when the
 // period does not read as one.

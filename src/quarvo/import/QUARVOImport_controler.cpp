@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <set>
 
+#include "host/Texte.h"
 #include "host/session/Session.h"
 #include "host/value/Identifiant.h"
 #include "quarvo/import/ImportOutils.h"
@@ -196,7 +197,7 @@ void QUARVOImport_controler::pour_tout(Evt*) {
       if (columns[i].name != "IDENT") staging2_->ecrire(columns[i].name, source.values[i]);
     }
     staging2_->ecrire("NUMERO_DOC",
-                      Valeur::chaine("A" + import::derniersCaracteres(pieceCourante_, 9)));
+                      Valeur::chaine("A" + derniersCaracteres(pieceCourante_, 9)));
     staging2_->ecrire("TYPE", Valeur::chaine("A"));
     if (staging2_->inserer() == 0) avoirs_.emplace_back(pieceCourante_, staging2_->courantId());
   }

@@ -2,16 +2,17 @@
 
 #include <algorithm>
 
+#include "host/Texte.h"
 #include "host/session/Session.h"
 #include "quarvo/frame/Appels.h"
 #include "quarvo/frame/Apports.h"
 #include "quarvo/frame/Keys.h"
+#include "quarvo/frame/PieceKinds.h"
 #include "quarvo/import/ImportOutils.h"
 
 namespace quarvo {
 
 using namespace host;
-using Montants = DifferencesGeneration::Montants;
 using Solde = DifferencesGeneration::Solde;
 
 QUARVOImport_generer::QUARVOImport_generer(Evt* evt, const DifferencesGeneration& kind)
@@ -113,8 +114,8 @@ void QUARVOImport_generer::debut(Evt* evt) {
     EvtParamVal societe{val("SOCIETE")};
     appeler("AFSOCI", "LECTURE_CODE", societe, "*1");
     std::string moisAnnee = iAfsoci_.valeur("MOIS_ANNEE").toChaine();
-    vMo_.set(import::caracteres(moisAnnee, 1, 2));
-    vAn_.set(import::caracteres(moisAnnee, 3, 6));
+    vMo_.set(caracteres(moisAnnee, 1, 2));
+    vAn_.set(caracteres(moisAnnee, 3, 6));
     vAnmo_.set(vAn_.text() + vMo_.text());
     receptions_ = iAfsoci_.valeur("OPTION9").toChaine() == "O";
   }
@@ -298,27 +299,20 @@ void QUARVOImport_generer::maj_ligne(Evt*) {
   LienAReporter lien;
   lien.budget = budgetIdent;
   lien.service = vPrestationIdent_.text();
-  for (const char* c : {"AFAFFA_IDENT", "AFAFFA_CODE", "PIECE", "DATE_DEBUT", "DATE_FIN"}) {
-    lien.budgetRow.emplace_back(c, afebud_.valeur(c));
-  }
-  for (const char* c : {"IDENT", "CODE"}) lien.projet.emplace_back(c, iAfaffa_.valeur(c));
-  for (const char* c : {"IDENT", "CODE", "DESIG", "UNITE", "POSTE_ACHAT"}) {
-    lien.prestation.emplace_back(c, iAfpres_.valeur(c));
-  }
+  lien.budgetAffaire = afebud_.valeur("AFAFFA_IDENT");
+  lien.budgetAffaireCode = afebud_.valeur("AFAFFA_CODE");
+  lien.budgetPiece = afebud_.valeur("PIECE");
+  lien.budgetDebut = afebud_.valeur("DATE_DEBUT");
+  lien.budgetFin = afebud_.valeur("DATE_FIN");
+  lien.affaire = iAfaffa_.valeur("IDENT");
+  lien.affaireCode = iAfaffa_.valeur("CODE");
+  lien.serviceCode = iAfpres_.valeur("CODE");
+  lien.serviceDesig = iAfpres_.valeur("DESIG");
+  lien.serviceUnite = iAfpres_.valeur("UNITE");
+  lien.servicePoste = iAfpres_.valeur("POSTE_ACHAT");
   lien.lignes.push_back(numero);
   liens_.push_back(std::move(lien));
 }
-
-namespace {
-
-Valeur colonne(const std::vector<std::pair<std::string, Valeur>>& row, const char* name) {
-  for (const auto& [column, value] : row) {
-    if (column == name) return value;
-  }
-  return Valeur();
-}
-
-}  // namespace
 
 void QUARVOImport_generer::reporterSurBudgets() {
   if (liens_.empty()) return;
@@ -327,7 +321,8 @@ void QUARVOImport_generer::reporterSurBudgets() {
   frame::EnteteAchat entete = frame::enteteAchat(kind_.entete, colonneEntete);
   Valeur dateMaj = pieces_.valeur("DATE_MAJ");
   Valeur heureMaj = pieces_.valeur("HEURE_MAJ");
-  Table lignes(this, "GESCOM", kind_.lignes, "LIGNES_PIECE");
+  Table lignes(this, "GESCOM", std::string(frame::kindOfTable(kind_.entete)->lines),
+               "LIGNES_PIECE");
   auto colonneLigne = [&lignes](const std::string& c) { return lignes.valeur(c); };
   for (const auto& lien : liens_) {
     double qte = 0;
@@ -368,15 +363,15 @@ void QUARVOImport_generer::reporterLien(const LienAReporter& lien, double qtt,
     aflbud_.preparer();
     aflbud_.ecrire("IDENT", ident.value());
     aflbud_.ecrire("NUMERO", Valeur::chaine(lien.budget + "|"));
-    aflbud_.ecrire("AFAFFA_IDENT", colonne(lien.budgetRow, "AFAFFA_IDENT"));
-    aflbud_.ecrire("AFAFFA_CODE", colonne(lien.budgetRow, "AFAFFA_CODE"));
-    aflbud_.ecrire("AFEBUD_PIECE", colonne(lien.budgetRow, "PIECE"));
-    aflbud_.ecrire("AFPRES_IDENT", colonne(lien.prestation, "IDENT"));
-    aflbud_.ecrire("AFPRES_CODE", colonne(lien.prestation, "CODE"));
-    aflbud_.ecrire("DESIG", colonne(lien.prestation, "DESIG"));
-    aflbud_.ecrire("UNITE", colonne(lien.prestation, "UNITE"));
-    aflbud_.ecrire("DATE_DEBUT", colonne(lien.budgetRow, "DATE_DEBUT"));
-    aflbud_.ecrire("DATE_FIN", colonne(lien.budgetRow, "DATE_FIN"));
+    aflbud_.ecrire("AFAFFA_IDENT", lien.budgetAffaire);
+    aflbud_.ecrire("AFAFFA_CODE", lien.budgetAffaireCode);
+    aflbud_.ecrire("AFEBUD_PIECE", lien.budgetPiece);
+    aflbud_.ecrire("AFPRES_IDENT", Valeur::chaine(lien.service));
+    aflbud_.ecrire("AFPRES_CODE", lien.serviceCode);
+    aflbud_.ecrire("DESIG", lien.serviceDesig);
+    aflbud_.ecrire("UNITE", lien.serviceUnite);
+    aflbud_.ecrire("DATE_DEBUT", lien.budgetDebut);
+    aflbud_.ecrire("DATE_FIN", lien.budgetFin);
     aflbud_.ecrire("APPRO", Valeur::chaine("A"));
     if (aflbud_.inserer() != 0) return;
   }
@@ -392,8 +387,8 @@ void QUARVOImport_generer::reporterLien(const LienAReporter& lien, double qtt,
     quarvo_.preparer();
     quarvo_.ecrire("IDENT", ident.value());
     quarvo_.ecrire("AFEBUD_IDENT", Valeur::chaine(lien.budget));
-    quarvo_.ecrire("AFAFFA_IDENT", colonne(lien.projet, "IDENT"));
-    quarvo_.ecrire("AFAFFA_CODE", colonne(lien.projet, "CODE"));
+    quarvo_.ecrire("AFAFFA_IDENT", lien.affaire);
+    quarvo_.ecrire("AFAFFA_CODE", lien.affaireCode);
     quarvo_.ecrire("AFLBUD_IDENT", Valeur::chaine(ligneIdent));
     quarvo_.ecrire("COMPOSANT", Valeur::chaine(kind_.entete));
     quarvo_.ecrire("COMPOSANT_IDENT", vPieceIdent_.value());
@@ -424,13 +419,13 @@ void QUARVOImport_generer::reporterLien(const LienAReporter& lien, double qtt,
 
   if (kind_.resultats) {
     std::string datePiece = quarvo_.valeur("DATE_PIECE").toChaine();
-    vAn_.set(import::caracteres(datePiece, 7, 10));
-    vMo_.set(import::caracteres(datePiece, 4, 5));
+    vAn_.set(caracteres(datePiece, 7, 10));
+    vMo_.set(caracteres(datePiece, 4, 5));
     vAnmo_.set(vAn_.text() + vMo_.text());
     Table resu(this, "", "M_RESU1", "");
     resu.preparer();
-    resu.ecrire("AFAFFA_IDENT", colonne(lien.projet, "IDENT"));
-    resu.ecrire("AFPOST_CODE", colonne(lien.prestation, "POSTE_ACHAT"));
+    resu.ecrire("AFAFFA_IDENT", lien.affaire);
+    resu.ecrire("AFPOST_CODE", lien.servicePoste);
     resu.ecrire("ANNEE_MOIS", vAnmo_.value());
     resu.ecrire("TYPE", Valeur::chaine("D"));
     resu.ecrire("VENG", Valeur::monnaie(-engage));
@@ -439,15 +434,15 @@ void QUARVOImport_generer::reporterLien(const LienAReporter& lien, double qtt,
     appeler("AFRESU", "MAJ_AFRESU", none);
   }
   if (kind_.calculRaf) {
-    pAffa_.assign(colonne(lien.projet, "IDENT"));
-    pPost_.assign(colonne(lien.prestation, "POSTE_ACHAT"));
+    pAffa_.assign(lien.affaire);
+    pPost_.assign(lien.servicePoste);
     pAnmo_.assign(vAnmo_.value());
     EvtParamRef raf{ref(pAffa_), ref(pPost_), ref(pAnmo_)};
     appeler("AFRESU", "CALCUL_RAF_D", raf);
   }
   // A receipt that books on the realised amounts has its accounting movement, as when it is
   // linked by hand or by the imputation (invoices get theirs with the piece).
-  if (kind_.entete == std::string("GAPEBL") && !realise.isZero()) {
+  if (kind_.mouvementLien && !realise.isZero()) {
     EvtParamVal lecture{val(kind_.entete), vPieceIdent_.value()};
     if (!appeler("AFMOUV", "LECTURE_CLE_COMPO", lecture)) {
       EvtParamVal genere{val(kind_.entete), vPieceIdent_.value()};

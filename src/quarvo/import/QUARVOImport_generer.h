@@ -38,17 +38,16 @@
 namespace quarvo {
 
 struct DifferencesGeneration {
-  enum class Montants { Aucun, Engage, Realise };
   enum class Solde { Toujours, SaufSoldee, Jamais };
 
   const char* code;     // "DF", "CF", "BF", "FF"
   const char* staging;  // staging table
   const char* entete;   // piece header table, also the piece module and the link component
-  const char* lignes;   // piece line table
   bool moisSociete;     // the company's current month is read (V_ANMO)
   bool avoirs;          // staged "TYPE" 'A' makes a credit note, booked negatively
   bool majLigne;        // lines are booked on the budget ("MAJ_LIGNE")
-  Montants montants;    // what the booking changes on the budget line
+  bool mouvementLien;   // receipts: a link booked on realised amounts brings the piece's
+                        // accounting movement (invoices get theirs with the piece)
   bool resultats;       // orders: a results row and "AFRESU" "MAJ_AFRESU" per line
   bool calculRaf;       // invoices: "AFRESU" "CALCUL_RAF_D" per line
   bool numeroEntete;    // invoices: the supplier's number goes to the header's "NUMERO"
@@ -59,27 +58,27 @@ struct DifferencesGeneration {
 // One kind per entry, its fields named.
 // clang-format off
 inline constexpr DifferencesGeneration kGenerationDf{
-    .code = "DF", .staging = "IMM_PIECE_DF", .entete = "GAPEDEV", .lignes = "GAPLDEV",
+    .code = "DF", .staging = "IMM_PIECE_DF", .entete = "GAPEDEV",
     .moisSociete = false, .avoirs = false, .majLigne = false,
-    .montants = DifferencesGeneration::Montants::Aucun,
+    .mouvementLien = false,
     .resultats = false, .calculRaf = false, .numeroEntete = false, .echeances = false,
     .solde = DifferencesGeneration::Solde::Toujours};
 inline constexpr DifferencesGeneration kGenerationCf{
-    .code = "CF", .staging = "IMM_PIECE_CF", .entete = "GAPECOM", .lignes = "GAPLCOM",
+    .code = "CF", .staging = "IMM_PIECE_CF", .entete = "GAPECOM",
     .moisSociete = true, .avoirs = false, .majLigne = true,
-    .montants = DifferencesGeneration::Montants::Engage,
+    .mouvementLien = false,
     .resultats = true, .calculRaf = false, .numeroEntete = false, .echeances = false,
     .solde = DifferencesGeneration::Solde::SaufSoldee};
 inline constexpr DifferencesGeneration kGenerationBf{
-    .code = "BF", .staging = "IMM_PIECE_BF", .entete = "GAPEBL", .lignes = "GAPLBL",
+    .code = "BF", .staging = "IMM_PIECE_BF", .entete = "GAPEBL",
     .moisSociete = true, .avoirs = false, .majLigne = true,
-    .montants = DifferencesGeneration::Montants::Aucun,
+    .mouvementLien = true,
     .resultats = false, .calculRaf = false, .numeroEntete = false, .echeances = false,
     .solde = DifferencesGeneration::Solde::SaufSoldee};
 inline constexpr DifferencesGeneration kGenerationFf{
-    .code = "FF", .staging = "IMM_PIECE_FF", .entete = "GAPEFAC", .lignes = "GAPLFAC",
+    .code = "FF", .staging = "IMM_PIECE_FF", .entete = "GAPEFAC",
     .moisSociete = true, .avoirs = true, .majLigne = true,
-    .montants = DifferencesGeneration::Montants::Realise,
+    .mouvementLien = false,
     .resultats = false, .calculRaf = true, .numeroEntete = true, .echeances = true,
     .solde = DifferencesGeneration::Solde::Jamais};
 // clang-format on
@@ -116,12 +115,13 @@ class QUARVOImport_generer : public host::Parcours {
   // The budget booking of one piece: the lines of one service in one budget, found by
   // "MAJ_LIGNE", booked together on one budget line through one link row when the piece ends.
   struct LienAReporter {
-    std::string budget;
-    std::string service;
-    std::vector<std::pair<std::string, host::Valeur>> budgetRow;   // the budget's columns
-    std::vector<std::pair<std::string, host::Valeur>> projet;      // the project's
-    std::vector<std::pair<std::string, host::Valeur>> prestation;  // the service's
-    std::vector<std::string> lignes;                               // piece lines' "NUMERO"
+    std::string budget;   // "AFEBUD" "IDENT"
+    std::string service;  // "AFPRES" "IDENT"
+    // What a new budget line and link row take from the budget, the project and the service.
+    host::Valeur budgetAffaire, budgetAffaireCode, budgetPiece, budgetDebut, budgetFin;
+    host::Valeur affaire, affaireCode;
+    host::Valeur serviceCode, serviceDesig, serviceUnite, servicePoste;
+    std::vector<std::string> lignes;  // piece lines' "NUMERO"
   };
   void reporterSurBudgets();
   void reporterLien(const LienAReporter& lien, double qtt, const host::Valeur& dateMaj,
