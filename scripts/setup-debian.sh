@@ -4,7 +4,7 @@
 set -euo pipefail
 packages=(g++ cmake ninja-build pkg-config libsqlite3-dev sqlite3 libfmt-dev libcli11-dev
           libgtest-dev libgmock-dev libcairo2-dev libpango1.0-dev libxlsxwriter-dev
-          poppler-utils unzip libbenchmark-dev libjemalloc-dev)
+          nlohmann-json3-dev poppler-utils unzip libbenchmark-dev libjemalloc-dev)
 if [ "${1:-}" = "--fuzz" ]; then
   packages+=(clang libclang-rt-14-dev)
 fi

@@ -26,7 +26,7 @@ TEST(SeletatTest, PeriodPresetsFollowTheCompanysCurrentMonth) {
   EXPECT_EQ(borne(s, "E"), "01/01/2026-31/12/2026");
   EXPECT_EQ(borne(s, "M"), "01/12/2026-31/12/2026");
   EXPECT_EQ(borne(s, "Z"), "01/12/2026-31/12/2026 refused");  // dates left as they were
-  EXPECT_EQ(s.ecran().controle("VDATEMAX").valeur.toChaine(), "31/12/2026");
+  EXPECT_EQ(s.champ("VDATEMAX")->text(), "31/12/2026");
   t.sql(R"(UPDATE "AFSOCI" SET "MOIS_ANNEE" = '022024')");
   EXPECT_EQ(borne(s, "M"), "01/02/2024-29/02/2024");
   EXPECT_EQ(borne(s, "T"), "01/01/2024-31/03/2024");

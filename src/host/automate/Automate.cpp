@@ -250,7 +250,15 @@ void Automate::lancerModule(const std::string&, const std::string&, const std::s
   }
   Evt copy = evt != nullptr ? evt->byValue() : EvtParamVal();
   Session& s = session_;
-  s.lancer([&s, name, copy]() mutable { s.appelerModule(name, &copy); });
+  // Once the launched automaton has ended, the window that launched it, when still open, is
+  // told it is active again.
+  s.lancer([&s, name, copy, lanceur = this]() mutable {
+    s.appelerModule(name, &copy);
+    if (s.estOuverte(lanceur) && lanceur->hasBranch("DEBUT_ACTIVATION")) {
+      EvtParamVal none;
+      lanceur->raise("DEBUT_ACTIVATION", &none);
+    }
+  });
   callOutcome_ = 0;
 }
 
@@ -265,7 +273,18 @@ std::string Automate::BoiteOuvrirFichier(const std::string& filter) {
 }
 
 Ecran& Automate::ecran() {
-  if (!ecran_) ecran_ = std::make_unique<Ecran>();
+  if (!ecran_) {
+    if (screen_.empty()) throw UException(name_ + " has no screen");
+    auto description = DescriptionEcran::de(session_.dataDir(), screen_);
+    // A field the screen shows is one of the automaton's: the screen draws its value.
+    for (const auto& c : description->champs) {
+      if (champ(c.nom) == nullptr) {
+        throw UException("the screen " + screen_ + " shows a field " + c.nom + " that " + name_ +
+                         " does not have");
+      }
+    }
+    ecran_ = std::make_unique<Ecran>(std::move(description));
+  }
   return *ecran_;
 }
 void Automate::autoriser(const std::string& c) {

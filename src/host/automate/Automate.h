@@ -117,8 +117,11 @@ class Automate {
                     const std::vector<std::string>& buttons);
   std::string BoiteOuvrirFichier(const std::string& filter);
 
-  // Screen controls.
+  // Screen controls. The screen state is built from the description of `nomEcran()` when first
+  // asked for; an automaton without a screen, or a control its screen does not declare, is a
+  // runtime fault (UException).
   Ecran& ecran();
+  bool aUnEcran() const { return !screen_.empty(); }
   void autoriser(const std::string& control);
   void interdire(const std::string& control);
   void cacher(const std::string& control);

@@ -1,8 +1,19 @@
 // A plain window: created with its parameters, it runs "INIT" and "DEBUT" (when bound) and then
-// stays open in its session, its screen model (`ecran()`) showing its controls, until a handler
-// ends it with `sortir`. Whoever drives the screen (a UI driver, a test) finds the open window
-// with `Session::fenetre` and raises its events ("VALIDATION", a button's label, ...).
+// stays open in its session until a handler ends it with `sortir`. Its screen (`ecran()`) is
+// built from the description of `nomEcran()`.
+//
+// A person works it through the screen model, which checks each action (the control exists, is
+// enabled, visible and on the current tab; the text converts to the field's kind) and then calls
+// the operation below that does what the person's action does. Each runs the handlers the
+// runtime raises for that action and answers false when the window refuses it: a handler
+// rejected its event (`rejeter`), and what it refused is undone (a field keeps its old value).
+// An outcome a handler reports (`erreurMethode`) is not a refusal: the import window reports
+// that errors were found, having done its work. Document windows override these operations
+// with their own events.
 #pragma once
+
+#include <string>
+#include <vector>
 
 #include "host/automate/Automate.h"
 
@@ -13,6 +24,33 @@ class Fenetre_simple : public Automate {
   using Automate::Automate;
   bool estFenetre() const override { return true; }
   void executer(Evt* evt) override;
+
+  // A value typed in `field` (already converted to its kind): the field takes it, then the
+  // labels the description gives for the field run in order (by default the field's name).
+  virtual bool saisirChamp(Field& field, const Valeur& value,
+                           const std::vector<std::string>& labels);
+  // A cell edited (row from 1): the row becomes current, the cell takes the text, then the
+  // column's label runs.
+  virtual bool saisirCellule(const std::string& list, size_t row, const std::string& column,
+                             const std::string& text);
+  // A row chosen (from 1): it becomes the current row.
+  virtual bool selectionnerLigne(const std::string& list, size_t row);
+  // A tab asked for: its request label runs (a handler may refuse it); then the tab is current
+  // and its entry label ("<tab>_ENTREE") runs.
+  virtual bool demanderOnglet(const std::string& tab);
+  // A button pressed: its label runs.
+  virtual bool presserBouton(const std::string& button);
+  // A line added at the end of a list, then current; a line deleted.
+  virtual bool nouvelleLigne(const std::string& list);
+  virtual bool supprimerLigne(const std::string& list, size_t row);
+  // The window's close box. With changes not saved, the window asks first whether to leave
+  // them; otherwise, or on yes, the window ends.
+  virtual void fermer();
+
+ protected:
+  // Raises `label` as a person's action does; false when the handler refused it. A label no
+  // handler is bound to refuses nothing.
+  bool leverAction(const std::string& label);
 };
 
 }  // namespace quarvo::host

@@ -37,6 +37,7 @@ Seletat::Seletat(Evt* creating)
       vtypeChoix_(chaine("VTYPE_CHOIX", "Type")),
       vsortie_(entier("VSORTIE", "Sortie", 1)),
       vfichier_(chaine("VFICHIER", "Fichier")) {
+  nomEcran("SELETAT");
   addBranch("INIT", [this](Evt* e) { init(e); });
   addBranch("DEBUT", [this](Evt* e) { debut(e); });
   addBranch("VALID", [this](Evt* e) { valid(e); });
@@ -185,7 +186,9 @@ void Seletat::fermerJauge() {
 }
 
 void Seletat::reafficher(const std::string& control) {
-  if (Field* f = champ(control)) ecran().controle(control).valeur = f->value();
+  // The screen draws each field's value as it is: redisplaying only asks that the control be
+  // one of the screen's.
+  ecran().controle(control);
 }
 
 }  // namespace quarvo::host

@@ -18,6 +18,8 @@
 // - budget-type options "VTYPE_OPT" ("T" all, "U" one) and "VTYPE_CHOIX" ("F", "E", "R", "N");
 // - output choice "VSORTIE" (0 export to a spreadsheet file, otherwise print) and the export
 //   file name "VFICHIER".
+// Its screen is "SELETAT" (db/screens/SELETAT.json); a derived screen names its own, which
+// extends it.
 //
 // Labels it binds: "INIT", "DEBUT", "VALID" (the OK button: raises "VALIDATION"), "VALIDATION",
 // "VCLASSEMENT_LIB_CHOIX" (offers the criteria in a choice list), "VCLASSEMENT_LIB_FERME" (sets

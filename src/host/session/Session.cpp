@@ -1,5 +1,8 @@
 #include "host/session/Session.h"
 
+#include <algorithm>
+#include <utility>
+
 #include "host/UException.h"
 #include "host/automate/Automate.h"
 
@@ -10,7 +13,11 @@ thread_local Session* currentSession = nullptr;
 }
 
 Session::Session(Database& db, UiDriver& ui, std::string company, std::string user)
-    : db_(db), ui_(ui), company_(std::move(company)), user_(std::move(user)) {}
+    : db_(db), ui_(&ui), company_(std::move(company)), user_(std::move(user)) {}
+
+UiDriver& Session::remplacerUi(UiDriver& ui) {
+  return *std::exchange(ui_, &ui);
+}
 
 Session::~Session() = default;
 
@@ -70,14 +77,42 @@ AutomatePtr Session::creer(const std::string& name, Evt* evt) {
 int Session::appelerModule(const std::string& name, Evt* evt) {
   AutomatePtr automate = creer(name, evt);
   if (!automate) {
-    ui_.incident("Le traitement " + name + " n'est pas disponible dans cette version.");
+    ui_->incident("Le traitement " + name + " n'est pas disponible dans cette version.");
     return 1;
   }
+  return executerAutomate(std::move(automate), evt);
+}
+
+int Session::executerAutomate(AutomatePtr automate, Evt* evt) {
   Scope scope(*this);
   automate->executer(evt);
-  int outcome = automate->outcome();
-  if (automate->estFenetre() && !automate->termine()) windows_.push_back(std::move(automate));
-  return outcome;
+  if (!automate->estFenetre() || automate->termine()) return automate->outcome();
+  if (!boucleModale_) {
+    int outcome = automate->outcome();
+    windows_.push_back(std::move(automate));
+    return outcome;
+  }
+  // The window's own loop: the work it launches runs within it, even when this call itself
+  // runs from the event loop (a window launched by another).
+  struct Empilee {
+    Session& s;
+    bool running;
+    ~Empilee() {
+      s.modales_.pop_back();
+      s.running_ = running;
+    }
+  } empilee{*this, running_};
+  modales_.push_back(automate.get());
+  running_ = false;
+  boucleModale_(*automate);
+  return automate->outcome();
+}
+
+bool Session::estOuverte(const Automate* automate) {
+  if (automate == nullptr || automate->termine()) return false;
+  if (std::find(modales_.begin(), modales_.end(), automate) != modales_.end()) return true;
+  return std::any_of(windows_.begin(), windows_.end(),
+                     [automate](const AutomatePtr& w) { return w.get() == automate; });
 }
 
 Automate* Session::fenetre(const std::string& name) {
@@ -103,7 +138,7 @@ int Session::appelerProcedure(const std::string& module, const std::string& labe
   } else {
     automate = creer(module + "-INTERFACE", nullptr);
     if (!automate) {
-      ui_.incident("Le module " + module + " n'est pas disponible.");
+      ui_->incident("Le module " + module + " n'est pas disponible.");
       return 1;
     }
     automate->marquerConstruit();
@@ -113,7 +148,7 @@ int Session::appelerProcedure(const std::string& module, const std::string& labe
   Evt* e = evt != nullptr ? evt : &none;
   if (automate->hasBranch("INIT")) automate->raise("INIT", e);
   if (!automate->raise(label, e)) {
-    ui_.incident("La procédure " + label + " n'existe pas dans le module " + module + ".");
+    ui_->incident("La procédure " + label + " n'existe pas dans le module " + module + ".");
     return 1;
   }
   int outcome = e->erreur();

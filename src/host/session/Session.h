@@ -44,7 +44,10 @@ class Session {
   };
 
   Database& db() { return db_; }
-  UiDriver& ui() { return ui_; }
+  UiDriver& ui() { return *ui_; }
+  // Puts `ui` in place of the driver the session was opened with (the screen model does, for
+  // as long as it lives); returns the one it replaces. REQUIRES: `ui` outlives its use.
+  UiDriver& remplacerUi(UiDriver& ui);
   const std::string& societe() const { return company_; }
   const std::string& utilisateur() const { return user_; }
   // Folder of the catalogues and data files (db/); set by whoever opens the session.
@@ -61,6 +64,8 @@ class Session {
   AutomatePtr creer(const std::string& name, Evt* evt);
   // Creates `name` and drives it to its end. Returns its outcome (1 when it could not be made).
   int appelerModule(const std::string& name, Evt* evt);
+  // Drives `automate`, made by `creer`, as appelerModule does.
+  int executerAutomate(AutomatePtr automate, Evt* evt);
   // Runs `label` of `module`'s interface automaton. Returns the outcome.
   int appelerProcedure(const std::string& module, const std::string& label, Evt* evt);
 
@@ -68,6 +73,16 @@ class Session {
   // has ended is released the next time the session looks.
   Automate* fenetre(const std::string& name);
   size_t fenetresOuvertes();
+  // Whether `automate` is a window of this session still open.
+  bool estOuverte(const Automate* automate);
+
+  // Modal windows. With a loop set (the screen model sets one), a window that `appelerModule`
+  // opens runs that loop until it ends, and only then does the call return: its caller waits,
+  // and reads what the window did. The loop receives the window; the window stays on the stack
+  // of `fenetresModales` (innermost last) while its loop runs. Without a loop, an opened window
+  // stays in the session and the call returns at once (batch drivers raise its events).
+  void setBoucleModale(std::function<void(Automate&)> boucle) { boucleModale_ = std::move(boucle); }
+  const std::vector<Automate*>& fenetresModales() const { return modales_; }
 
   // Event loop: launched work runs in order when the loop is run, each item to its end.
   void lancer(std::function<void()> work);
@@ -76,13 +91,15 @@ class Session {
 
  private:
   Database& db_;
-  UiDriver& ui_;
+  UiDriver* ui_;
   std::string company_;
   std::string user_;
   std::filesystem::path dataDir_ = "db";
   std::unordered_map<std::string, std::unique_ptr<MemoryStore>> memory_;
   std::deque<std::function<void()>> pending_;
   std::vector<AutomatePtr> windows_;
+  std::vector<Automate*> modales_;
+  std::function<void(Automate&)> boucleModale_;
   bool running_ = false;
   // Interface automata between two calls, by module: a batch calls the same few interfaces
   // for every line, and making one costs more than most calls. Several are kept when calls
