@@ -18,6 +18,7 @@
 #include "app/ImportCommand.h"
 #include "app/ImputeCommand.h"
 #include "app/ReportCommand.h"
+#include "app/ScreenCommand.h"
 #include "app/Tsv.h"
 #include "app/Workspace.h"
 #include "host/UException.h"
@@ -288,6 +289,25 @@ Commande reportCommand(CLI::App& cli) {
           }};
 }
 
+Commande screenCommand(CLI::App& cli) {
+  auto o = std::make_shared<ScreenOptions>();
+  auto* app = cli.add_subcommand(
+      "screen", "Open a screen and play actions on it (a script, or at a prompt on a terminal)");
+  app->add_option("NAME", o->name, "Screen automaton, e.g. QUARVO-SELETAT1")->required();
+  app->add_option("ARGS", o->args, "Positional parameters of the screen");
+  app->add_option("--script", o->script,
+                  "File of actions, one per line ('-' the standard input): set FIELD VALUE, "
+                  "cell LIST ROW COLUMN VALUE, select LIST ROW, tab NAME, press BUTTON, new "
+                  "LIST, delete LIST ROW, answer N|TEXT|PATH, close");
+  app->add_flag("--json", o->json, "Print each state as one JSON object per line");
+  return {app, Commande::Base::Ouverte, true, [o](Contexte& c) {
+            if (!c.options.answers.empty()) {
+              throw UsageError("--answer does not apply to 'screen': answer in the script");
+            }
+            return runScreen(*c.session, *o, std::cin, isatty(STDIN_FILENO) != 0, c.out, c.err);
+          }};
+}
+
 Commande genCommand(CLI::App& cli) {
   auto o = std::make_shared<GenerateOptions>();
   auto* app = cli.add_subcommand(
@@ -365,6 +385,7 @@ int runCommandLine(int argc, char** argv, std::ostream& out, std::ostream& err) 
       imputeCommand(cli),
       importCommand(cli),
       reportCommand(cli),
+      screenCommand(cli),
       genCommand(cli),
       demoCommand(cli),
   };

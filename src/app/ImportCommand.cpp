@@ -5,10 +5,11 @@
 #include <array>
 #include <filesystem>
 
+#include "app/PiloteEcran.h"
 #include "app/Workspace.h"
 #include "host/automate/Automate.h"
 #include "host/table/Table.h"
-#include "host/ui/Ecran.h"
+#include "host/ui/ModeleEcran.h"
 #include "quarvo/import/QUARVOImporter_auto.h"
 
 namespace quarvo::app {
@@ -82,28 +83,36 @@ int runImport(Session& session, const ImportOptions& o, std::ostream& out) {
     throw UsageError("name at least one file (--df, --cf, --bf, --ff) or use --auto");
   }
   std::string before = dernierNumeroErreur();
-  EvtParamVal none;
-  session.appelerModule("QUARVO-IMPORTER", &none);
-  Automate* window = session.fenetre("QUARVO-IMPORTER");
-  if (window == nullptr) throw UsageError("the import window could not be opened");
+  UiDriver& terminal = session.ui();
+  ModeleEcran model(session, &terminal, true);
+  if (model.ouvrir("QUARVO-IMPORTER") != ModeleEcran::Ouverture::Ouverte) {
+    throw UsageError("the import window could not be opened");
+  }
+  PiloteEcran window(model, terminal);
+  // Exactly the files given: a kind not given is emptied of its default file.
   for (const auto& [field, path] : files) {
-    if (!path.empty() && !window->ecran().controle(field).actif) {
+    if (!window.actif(field)) {
+      if (path.empty()) continue;
       out << "the import of " << std::string(field).substr(10)
           << " files is switched off in the settings (AFPARA): " << path << " is not imported\n";
+      continue;
     }
-    window->champ(field)->set(path);
+    if (!window.saisir(field, path)) {
+      throw UsageError("the import window refuses " + path + ": " + window.refus());
+    }
   }
-  window->champ("V_MODE")->set(int64_t{o.checkOnly ? 0 : 1});
-  window->raise("VALIDATION", &none);
-  session.executerEnAttente();
-  if (!window->termine()) {
+  window.saisir("V_MODE", o.checkOnly ? "0" : "1");
+  window.presser("VALIDATION");
+  if (window.ouverte()) {
     out << "the files were refused: nothing was imported\n";
-    window->sortir();
+    model.fermerTout();
     return 1;
   }
-  int64_t errors = window->outcome() != 0 ? 1 : 0;
+  // The window has closed: its error flags are read from what it held when it closed.
+  int64_t errors = model.resultatFerme() != 0 ? 1 : 0;
   for (const char* field : {"V_ERREUR_DF", "V_ERREUR_CF", "V_ERREUR_BF", "V_ERREUR_FF"}) {
-    errors += window->champ(field)->entier();
+    auto it = model.champsFermes().find(field);
+    if (it != model.champsFermes().end() && it->second != "0") ++errors;
   }
   // The window has shown this run's errors in its error list: they are not printed again.
   int64_t recorded = erreursApres(before);

@@ -3,11 +3,13 @@
 #include <ostream>
 #include <sstream>
 
+#include "app/PiloteEcran.h"
 #include "app/Workspace.h"
 #include "host/automate/Automate.h"
 #include "host/automate/Edition_etat.h"
 #include "host/automate/Seletat.h"
 #include "host/table/Table.h"
+#include "host/ui/ModeleEcran.h"
 
 namespace quarvo::app {
 
@@ -16,25 +18,10 @@ namespace fs = std::filesystem;
 
 namespace {
 
-void poser(Automate& w, const std::string& field, const std::string& value) {
-  Field* f = w.champ(field);
-  if (f == nullptr || !f->assign(Valeur::chaine(value))) {
-    throw UsageError("the report screen refuses " + field + " = '" + value + "'");
-  }
-}
-
 std::string date(const std::string& option, const std::string& text) {
   auto d = Date::parse(text);
   if (!d || d->empty()) throw UsageError(option + " expects a date dd/mm/yyyy, not '" + text + "'");
   return d->text();
-}
-
-// Presses the screen's OK button and lets the work it launched run. Returns its refusal flag.
-int valider(Session& session, Automate& w) {
-  EvtParamVal e;
-  w.raise("VALID", &e);
-  session.executerEnAttente();
-  return e.erreur();
 }
 
 bool ecrit(const fs::path& file) {
@@ -79,45 +66,51 @@ int runReport(Session& session, const ReportOptions& o, std::ostream& out, Repor
     budgetProject = budget.valeur("AFAFFA_CODE").toChaine();
   }
 
-  session.appelerModule("QUARVO-SELETAT1", nullptr);
-  Automate* window = session.fenetre("QUARVO-SELETAT1");
-  if (window == nullptr) throw UsageError("the report screen QUARVO-SELETAT1 is not available");
-  Automate& w = *window;
-  if (!o.from.empty()) poser(w, "VDATEMIN", date("--from", o.from));
-  if (!o.to.empty()) poser(w, "VDATEMAX", date("--to", o.to));
+  UiDriver& terminal = session.ui();
+  ModeleEcran model(session, &terminal, true);
+  if (model.ouvrir("QUARVO-SELETAT1") != ModeleEcran::Ouverture::Ouverte) {
+    throw UsageError("the report screen QUARVO-SELETAT1 could not be opened");
+  }
+  PiloteEcran screen(model, terminal);
+  // Typed as a person types them: each field's handler runs (the criterion enables the
+  // recapitulations, the print options follow their rules).
+  auto poser = [&](const std::string& field, const std::string& value) {
+    if (!screen.saisir(field, value)) {
+      throw UsageError("the report screen refuses " + field + " = '" + value +
+                       "': " + screen.refus());
+    }
+  };
+  if (!o.from.empty()) poser("VDATEMIN", date("--from", o.from));
+  if (!o.to.empty()) poser("VDATEMAX", date("--to", o.to));
   if (!o.project.empty()) {
-    poser(w, "VAFFA_CHOIX", "A");
-    poser(w, "VAFFA_CODE", o.project);
+    poser("VAFFA_CHOIX", "A");
+    poser("VAFFA_CODE", o.project);
   }
   if (!o.budget.empty()) {
-    poser(w, "VAFFA_CHOIX", "B");
-    poser(w, "VAFFA_CODE", budgetProject);
-    poser(w, "VAFEBUD_IDENT", o.budget);
+    poser("VAFFA_CHOIX", "B");
+    poser("VAFFA_CODE", budgetProject);
+    poser("VAFEBUD_IDENT", o.budget);
   }
-  poser(w, "VCLASSEMENT", o.criterion);
-  {
-    EvtParamVal e;
-    w.raise("VCLASSEMENT_LIB_FERME", &e);
-  }
+  poser("VCLASSEMENT", o.criterion);
   if (!o.options.empty()) {
     const char* names[] = {"VFOLIO", "VCORPS", "VCORPS2", "VRECAP1", "VRECAP2"};
-    for (size_t i = 0; i < 5; ++i) poser(w, names[i], std::string(1, o.options[i]));
+    for (size_t i = 0; i < 5; ++i) poser(names[i], std::string(1, o.options[i]));
   }
   if (!state.empty()) {
-    poser(w, "VETAT", state);
-    poser(w, state == "C" ? "VCLOS2" : "VCLOS", closed == "O" ? "O" : "N");
+    poser("VETAT", state);
+    poser(state == "C" ? "VCLOS2" : "VCLOS", closed == "O" ? "O" : "N");
   }
-  poser(w, "VPERIO_ANT", o.beforePeriod ? "1" : "0");
+  poser("VPERIO_ANT", o.beforePeriod ? "1" : "0");
 
   ReportPaths done;
   int rc = 0;
   if (o.exportFile) {
-    if (!o.exportFile->empty()) poser(w, "VFICHIER", *o.exportFile);
-    fs::path file = w.champ("VFICHIER")->text();
+    if (!o.exportFile->empty()) poser("VFICHIER", *o.exportFile);
+    fs::path file = screen.valeur("VFICHIER");
     std::error_code ec;
     fs::remove(file, ec);
-    poser(w, "VSORTIE", "0");
-    if (valider(session, w) != 0 || !ecrit(file)) {
+    poser("VSORTIE", "0");
+    if (!screen.presser("VALID") || !ecrit(file)) {
       rc = 1;
     } else {
       done.exported = file;
@@ -130,16 +123,15 @@ int runReport(Session& session, const ReportOptions& o, std::ostream& out, Repor
     Edition_etat::Destination destination(session, pdf);
     std::error_code ec;
     fs::remove(pdf, ec);
-    poser(w, "VSORTIE", "1");
-    if (valider(session, w) != 0 || !ecrit(pdf)) {
+    poser("VSORTIE", "1");
+    if (!screen.presser("VALID") || !ecrit(pdf)) {
       rc = 1;
     } else {
       done.pdf = pdf;
       out << "report printed to " << pdf.string() << "\n";
     }
   }
-  w.sortir();
-  session.fenetresOuvertes();
+  model.fermerTout();
   if (paths != nullptr) *paths = done;
   return rc;
 }

@@ -1,0 +1,38 @@
+// The "screen" command: a screen automaton worked through the screen model, from a script or at
+// a prompt.
+//
+//   quarvo screen NAME [ARG...] [--script FILE|-] [--json]
+//
+// Opens NAME with the ARGs as its positional parameters (as "run" passes them), then plays the
+// script's actions one per line (see host/ui/Action.h for the words) and prints the state after
+// opening and after each action: stable text, or with --json one JSON object per line. Without
+// --script, actions are read from the standard input: at a terminal, interactively (a prompt,
+// the state redrawn after each action, a refused action does not end the session); otherwise
+// as a script. At the end, every window still open is closed as a person would close it, a
+// pending question getting its last button.
+//
+// Exit codes: 0 every action accepted; 1 the screen refused to open, or an action was refused
+// (its refusal printed; the actions after it are not played); 2 a usage error: an unknown
+// screen, an automaton that is not a screen, a script line that is not an action (named by its
+// line number, before any action is played), --answer given (answers come from the script).
+#pragma once
+
+#include <iosfwd>
+#include <string>
+#include <vector>
+
+#include "host/session/Session.h"
+
+namespace quarvo::app {
+
+struct ScreenOptions {
+  std::string name;
+  std::vector<std::string> args;
+  std::string script;  // a file, "-" for the standard input, empty: the standard input
+  bool json = false;
+};
+
+int runScreen(host::Session& session, const ScreenOptions& options, std::istream& in,
+              bool interactive, std::ostream& out, std::ostream& err);
+
+}  // namespace quarvo::app
