@@ -4,7 +4,8 @@
 #                               build also compiles the benchmarks, so that they cannot rot
 #   scripts/test.sh --sanitize  the suite under the address and undefined-behaviour sanitizers
 #                               (build-asan/), without the tests labelled "long"
-#   scripts/test.sh --tsan      the store's tests under the thread sanitizer (build-tsan/)
+#   scripts/test.sh --tsan      the tests of what runs threads of its own (the store, the screen
+#                               model) under the thread sanitizer (build-tsan/)
 set -euo pipefail
 cd "$(dirname "$0")/.."
 scripts/setup-debian.sh
@@ -20,9 +21,9 @@ case "${1:-}" in
   --tsan)
     dir=build-tsan
     flags=(-DCMAKE_BUILD_TYPE=RelWithDebInfo -DQUARVO_TSAN=ON -DQUARVO_TESTS=ON -DQUARVO_BENCH=OFF)
-    # Only the store runs threads of its own; elsewhere pango's fontconfig thread is not
-    # instrumented and a test forks.
-    select=(-R '^(Sqlite|TableTest\.)')
+    # Only the store and the screen model run threads of their own; elsewhere pango's
+    # fontconfig thread is not instrumented and a test forks.
+    select=(-R '^(Sqlite|TableTest\.|ModeleEcranTest\.)')
     ;;
   "") ;;
   *)

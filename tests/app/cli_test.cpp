@@ -112,6 +112,14 @@ TEST_F(CliTest, RunPrintsResultsAndOutcome) {
   EXPECT_NE(bad.out.find("parameter 0 ('deux')"), std::string::npos);
   EXPECT_EQ(quarvo("run QUARVO-NOTHING").code, 2);
   EXPECT_EQ(quarvo("call NOMODULE LECTURE 1").code, 2);
+  // A screen's answers come from its script; a script from a file.
+  write("s.txt", "set VDATEMIN 01/01/2026\npress VALID\n");
+  EXPECT_EQ(quarvo("screen QUARVO-NOTHING --script " + (dir_ / "s.txt").string()).code, 2);
+  EXPECT_EQ(quarvo("--answer 1 screen QUARVO-SELETAT1 --script " + (dir_ / "s.txt").string()).code,
+            2);
+  Result screen = quarvo("screen QUARVO-SELETAT1 --json --script " + (dir_ / "s.txt").string());
+  EXPECT_EQ(screen.code, 0) << screen.out;
+  EXPECT_EQ(screen.out.rfind("{\"version\":1,\"windows\":[{\"screen\":\"SELETAT1\"", 0), 0u);
   EXPECT_NE(quarvo("automata").out.find("QUARVO-EXISTE_CHAINAGE_AVAL\n"), std::string::npos);
   // A word that names no command is named back; a company that does not exist is refused by
   // every command that runs its automata, not by those that set a database up.
