@@ -1,5 +1,6 @@
 #include "host/automate/Automate.h"
 
+#include <atomic>
 #include <charconv>
 
 #include "host/session/Session.h"
@@ -8,7 +9,11 @@
 
 namespace quarvo::host {
 
-Automate::Automate(Evt*) : session_(Session::current()) {
+namespace {
+std::atomic<uint64_t> instances{0};
+}
+
+Automate::Automate(Evt*) : session_(Session::current()), instance_(++instances) {
   // Room for the branches of most automata, so that declaring them never moves the list.
   branches_.reserve(32);
 }
@@ -252,9 +257,10 @@ void Automate::lancerModule(const std::string&, const std::string&, const std::s
   Session& s = session_;
   // Once the launched automaton has ended, the window that launched it, when still open, is
   // told it is active again.
-  s.lancer([&s, name, copy, lanceur = this]() mutable {
+  s.lancer([&s, name, copy, lanceur = this, numero = instance_]() mutable {
     s.appelerModule(name, &copy);
-    if (s.estOuverte(lanceur) && lanceur->hasBranch("DEBUT_ACTIVATION")) {
+    if (s.estOuverte(lanceur) && lanceur->numeroInstance() == numero &&
+        lanceur->hasBranch("DEBUT_ACTIVATION")) {
       EvtParamVal none;
       lanceur->raise("DEBUT_ACTIVATION", &none);
     }

@@ -12,6 +12,7 @@
 // dialogs and other automata through it. Not thread-safe: the session drives one at a time.
 #pragma once
 
+#include <cstdint>
 #include <functional>
 #include <map>
 #include <memory>
@@ -38,6 +39,9 @@ class Automate {
   Automate& operator=(const Automate&) = delete;
 
   Session& session() const { return session_; }
+  // A number no other automaton of the process has had: tells an automaton from one made later
+  // at the same address.
+  uint64_t numeroInstance() const { return instance_; }
   const std::string& nomAutomate() const { return name_; }
   void setNomAutomate(std::string name) { name_ = std::move(name); }
 
@@ -162,6 +166,7 @@ class Automate {
 
  private:
   Session& session_;
+  uint64_t instance_;
   std::string name_;
   std::string base_ = "VOVOVA";
   std::string table_;

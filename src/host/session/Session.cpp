@@ -109,10 +109,11 @@ int Session::executerAutomate(AutomatePtr automate, Evt* evt) {
 }
 
 bool Session::estOuverte(const Automate* automate) {
-  if (automate == nullptr || automate->termine()) return false;
-  if (std::find(modales_.begin(), modales_.end(), automate) != modales_.end()) return true;
-  return std::any_of(windows_.begin(), windows_.end(),
-                     [automate](const AutomatePtr& w) { return w.get() == automate; });
+  // Found among the windows before it is looked at: `automate` may be gone.
+  bool found = std::find(modales_.begin(), modales_.end(), automate) != modales_.end() ||
+               std::any_of(windows_.begin(), windows_.end(),
+                           [automate](const AutomatePtr& w) { return w.get() == automate; });
+  return found && !automate->termine();
 }
 
 Automate* Session::fenetre(const std::string& name) {

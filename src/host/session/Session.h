@@ -73,7 +73,8 @@ class Session {
   // has ended is released the next time the session looks.
   Automate* fenetre(const std::string& name);
   size_t fenetresOuvertes();
-  // Whether `automate` is a window of this session still open.
+  // Whether `automate` is a window of this session still open. `automate` may be an automaton
+  // that no longer exists (it is only compared with the open windows).
   bool estOuverte(const Automate* automate);
 
   // Modal windows. With a loop set (the screen model sets one), a window that `appelerModule`

@@ -65,9 +65,7 @@ void QUARVOImporter::debut(Evt* evt) {
     } else {
       fichiers_[k]->assign(afpara_.valeur("PARAM2"));
     }
-    ecran().controle(sorte.champ).valeur = fichiers_[k]->value();
   }
-  ecran().controle("V_MODE").valeur = vMode_.value();
   Automate::debut(evt);
 }
 
@@ -83,7 +81,6 @@ void QUARVOImporter::choisir(Evt* evt, size_t kind) {
   std::string chosen = BoiteOuvrirFichier("Tous les fichiers (*.*)|*.*");
   vOk_.set(int64_t{chosen.empty() ? 0 : 1});
   if (!chosen.empty()) fichier.set(chosen);
-  ecran().controle(sorte.champ).valeur = fichier.value();
   erreurMethode(0, evt);
 }
 

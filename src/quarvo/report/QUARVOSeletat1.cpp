@@ -116,8 +116,7 @@ void QUARVOSeletat1::reafficherOptions() {
   for (const char* option : {"VFOLIO", "VCORPS", "VCORPS2", "VRECAP1", "VRECAP2"}) {
     reafficher(option);
   }
-  ecran().controle("GRP_OPTIONS").valeur = Valeur::chaine(
-      vfolio_.text() + vcorps_.text() + vcorps2_.text() + vrecap1_.text() + vrecap2_.text());
+  reafficher("GRP_OPTIONS");
 }
 
 bool QUARVOSeletat1::lireSociete() {
@@ -164,7 +163,6 @@ void QUARVOSeletat1::debut(Evt* evt) {
         Table::repSGBD() / "VOVOVA" / (session().utilisateur() + ".$so") / "suivi_achats.xls";
     vfichier_.set(path.string());
   }
-  for (const auto& f : champs()) reafficher(f->name());
 }
 
 void QUARVOSeletat1::vfolio(Evt*) {
