@@ -308,6 +308,28 @@ Commande screenCommand(CLI::App& cli) {
           }};
 }
 
+Commande linkCommand(CLI::App& cli) {
+  auto o = std::make_shared<ScreenOptions>();
+  auto line = std::make_shared<std::string>();
+  auto modes = std::make_shared<std::string>("VMCA");
+  auto* app = cli.add_subcommand(
+      "link", "Open the link document of a budget line and play actions on it, as 'screen' does");
+  app->add_option("LINE", *line, "Budget line identifier (AFLBUD IDENT)")->required();
+  app->add_option("--mode", *modes,
+                  "Functions allowed: V view, C new lines, M modify, A delete (narrowed by the "
+                  "user's rights)")
+      ->capture_default_str();
+  app->add_option("--script", o->script, "File of actions, one per line ('-' the standard input)");
+  app->add_flag("--json", o->json, "Print each state as one JSON object per line");
+  return {app, Commande::Base::Ouverte, true, [o, line, modes](Contexte& c) {
+            if (!c.options.answers.empty()) {
+              throw UsageError("--answer does not apply to 'link': answer in the script");
+            }
+            return runLink(*c.session, *line, *modes, *o, std::cin, isatty(STDIN_FILENO) != 0,
+                           c.out, c.err);
+          }};
+}
+
 Commande genCommand(CLI::App& cli) {
   auto o = std::make_shared<GenerateOptions>();
   auto* app = cli.add_subcommand(
@@ -386,6 +408,7 @@ int runCommandLine(int argc, char** argv, std::ostream& out, std::ostream& err) 
       importCommand(cli),
       reportCommand(cli),
       screenCommand(cli),
+      linkCommand(cli),
       genCommand(cli),
       demoCommand(cli),
   };

@@ -4,6 +4,7 @@
 #include <iostream>
 
 #include "app/Workspace.h"
+#include "host/table/Table.h"
 #include "host/ui/ModeleEcran.h"
 
 namespace quarvo::app {
@@ -68,7 +69,9 @@ int runScreen(Session& session, const ScreenOptions& o, std::istream& in, bool i
 
   // The waiting box goes to the terminal as a progress bar; everything else is in the state.
   ModeleEcran model(session, &session.ui(), false);
-  switch (model.ouvrir(o.name, o.args)) {
+  auto ouverture =
+      o.module.empty() ? model.ouvrir(o.name, o.args) : model.appeler(o.module, o.label, o.args);
+  switch (ouverture) {
     case ModeleEcran::Ouverture::Inconnue:
       throw UsageError("unknown screen " + o.name + " (see 'quarvo automata')");
     case ModeleEcran::Ouverture::PasUnEcran:
@@ -114,6 +117,30 @@ int runScreen(Session& session, const ScreenOptions& o, std::istream& in, bool i
   }
   model.fermerTout();
   return 0;
+}
+
+int runLink(Session& session, const std::string& line, const std::string& modes, ScreenOptions o,
+            std::istream& in, bool interactive, std::ostream& out, std::ostream& err) {
+  if (modes.empty() || modes.find_first_not_of("VCMAvcma") != std::string::npos) {
+    throw UsageError("--mode expects letters among V, C, M, A (and their lower case), not '" +
+                     modes + "'");
+  }
+  // The budget is the one the line's number starts with.
+  std::string budget;
+  {
+    Session::Scope scope(session);
+    Table lignes(nullptr, "VOVOVA", "AFLBUD", "LINK");
+    if (lignes.chercher(3, "IDENT", '=', Valeur::chaine(line)) != 0) {
+      throw UsageError("unknown budget line " + line + " (see 'quarvo dump AFLBUD')");
+    }
+    std::string numero = lignes.valeur("NUMERO").toChaine();
+    budget = numero.substr(0, numero.find('|'));
+  }
+  o.name = "QUARVO-GESTION";
+  o.module = "QUARVO";
+  o.label = "GESTION";
+  o.args = {budget, line, modes};
+  return runScreen(session, o, in, interactive, out, err);
 }
 
 }  // namespace quarvo::app

@@ -28,11 +28,27 @@ namespace quarvo::app {
 struct ScreenOptions {
   std::string name;
   std::vector<std::string> args;
+  // Set: the screen is the window this interface label opens (module, label), as a menu opens
+  // it, with `args` as the label's parameters; `name` then only names it in messages.
+  std::string module;
+  std::string label;
   std::string script;  // a file, "-" for the standard input, empty: the standard input
   bool json = false;
 };
 
 int runScreen(host::Session& session, const ScreenOptions& options, std::istream& in,
               bool interactive, std::ostream& out, std::ostream& err);
+
+// The "link" command: the link document of one budget line, opened through the module's
+// interface label "GESTION" (its budget found from the line; modes narrowed by the user's
+// rights), then worked as "screen" works a screen.
+//
+//   quarvo link LINE [--mode LETTERS] [--script FILE|-] [--json]
+//
+// Exit codes as "screen"; an unknown line is a usage error (2); a document that refuses to
+// open (a line of a budget that cannot be read, no right) gives 1.
+int runLink(host::Session& session, const std::string& line, const std::string& modes,
+            ScreenOptions options, std::istream& in, bool interactive, std::ostream& out,
+            std::ostream& err);
 
 }  // namespace quarvo::app

@@ -168,9 +168,9 @@ DescriptionEcran DescriptionEcran::lire(const std::string& text, const std::stri
       if (const json* columns = l.tableau("columns")) {
         for (size_t k = 0; k < columns->size(); ++k) {
           Objet c((*columns)[k], l.where() + " column " + std::to_string(k + 1),
-                  {"name", "header", "editable", "kind"});
-          liste.colonnes.push_back(
-              {c.texte("name", true), c.texte("header"), c.booleen("editable", false), c.genre()});
+                  {"name", "header", "column", "editable", "kind"});
+          liste.colonnes.push_back({c.texte("name", true), c.texte("header"), c.texte("column"),
+                                    c.booleen("editable", false), c.genre()});
         }
       }
       d.listes.push_back(std::move(liste));

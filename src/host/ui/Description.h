@@ -53,6 +53,7 @@ struct DescOnglet {
 struct DescColonne {
   std::string nom;  // also the label raised when a person changes a cell of the column
   std::string entete;
+  std::string colonne;  // the table column a document's list shows in it; empty: none
   bool editable = false;
   GenreChamp genre = GenreChamp::Texte;
 };

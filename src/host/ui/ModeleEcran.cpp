@@ -6,6 +6,7 @@
 #include "host/UException.h"
 #include "host/automate/Automate.h"
 #include "host/automate/Fenetre_simple.h"
+#include "host/automate/Registry.h"
 #include "host/session/Session.h"
 #include "host/ui/Ecran.h"
 
@@ -289,6 +290,34 @@ ModeleEcran::Ouverture ModeleEcran::ouvrir(const std::string& name,
     return Ouverture::Refusee;
   }
   return ouverture_;
+}
+
+ModeleEcran::Ouverture ModeleEcran::appeler(const std::string& module, const std::string& label,
+                                            const std::vector<std::string>& params) {
+  if (etat_.dialogue) {
+    refuserIci("", "Une question attend sa réponse.");
+    return Ouverture::Refusee;
+  }
+  if (!Registry::instance().find(module + "-INTERFACE")) return Ouverture::Inconnue;
+  size_t avant = etat_.fenetres.size();
+  soumettre([this, module, label, params] {
+    std::vector<std::unique_ptr<Field>> fields;
+    std::vector<Arg> args;
+    for (size_t i = 0; i < params.size(); ++i) {
+      fields.push_back(std::make_unique<Field>("ARG" + std::to_string(i), "", "", 4, Kind::Chaine,
+                                               Valeur::chaine(params[i]), nullptr));
+      args.push_back(fields.back().get());
+    }
+    EvtParamRef evt(args);
+    int boucles = boucles_;
+    session_.appelerProcedure(module, label, &evt);
+    // The window the label launched opens when the launched work runs.
+    session_.executerEnAttente();
+    if (boucles_ == boucles) {
+      refuser("", messages_.empty() ? label + " n'a ouvert aucune fenêtre." : messages_.back());
+    }
+  });
+  return etat_.fenetres.size() > avant ? Ouverture::Ouverte : Ouverture::Refusee;
 }
 
 bool ModeleEcran::agir(const Action& action) {

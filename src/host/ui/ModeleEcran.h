@@ -57,6 +57,11 @@ class ModeleEcran {
   // Opens the screen automaton `name` with `params` as its positional parameters (text values
   // bound by value). Refusee: the window ended while opening (its messages are in the state).
   Ouverture ouvrir(const std::string& name, const std::vector<std::string>& params = {});
+  // Runs `label` of `module`'s interface with `params` as a menu runs it: the window that label
+  // opens is the one the actions then work. Inconnue: no such module; Refusee: no window opened
+  // (the interface's messages say why).
+  Ouverture appeler(const std::string& module, const std::string& label,
+                    const std::vector<std::string>& params = {});
   // Plays one action; false when it was refused (the refusal is in the state).
   bool agir(const Action& action);
   // Closes every window still open, innermost first, as `close` does: a pending dialog gets its

@@ -15,6 +15,7 @@
 #include "quarvo/imputation/QUARVOImputer_pieces.h"
 #include "quarvo/imputation/QUARVOPointer_pieces.h"
 #include "quarvo/links/QUARVOExiste_chainage_aval.h"
+#include "quarvo/links/QUARVOGestion.h"
 #include "quarvo/links/QUARVOInterface.h"
 #include "quarvo/report/QUARVOExpetat1.h"
 #include "quarvo/report/QUARVOImpetat1.h"
@@ -45,6 +46,7 @@ const Source sourceB("QUARVO", nullptr);
 const Global globalC("COMMUN", "QUARVO");
 const Module existeChainageAval("", "QUARVO-EXISTE_CHAINAGE_AVAL",
                                 &fabriquer<QUARVOExiste_chainage_aval>, false, "");
+const Module gestion("", "QUARVO-GESTION", &fabriquer<QUARVOGestion>, false, "");
 const Source sourceC("QUARVO", nullptr);
 
 // Unit D: follow-up report.
