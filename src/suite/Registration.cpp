@@ -5,6 +5,7 @@
 #include "suite/Action.h"
 #include "suite/Afaffa.h"
 #include "suite/Afdroi.h"
+#include "suite/Afeffo.h"
 #include "suite/Afmenu.h"
 #include "suite/Afmouv.h"
 #include "suite/Afpara.h"
@@ -14,7 +15,9 @@
 #include "suite/Commun.h"
 #include "suite/Gcpcompt.h"
 #include "suite/Gcptva.h"
+#include "suite/LignesPiece.h"
 #include "suite/Parametres.h"
+#include "suite/PieceAchat.h"
 #include "suite/PieceGeneration.h"
 #include "suite/PurchasingServices.h"
 #include "suite/Settling.h"
@@ -51,13 +54,9 @@ QUARVO_TABLE_MODULE(AFFOUR);
 QUARVO_TABLE_MODULE(AFSERV);
 QUARVO_TABLE_MODULE(AFPERS);
 QUARVO_TABLE_MODULE(AFVOCA);
-QUARVO_TABLE_MODULE(AFEFFO);
 QUARVO_TABLE_MODULE(GCPARTIC);
 QUARVO_TABLE_MODULE(SVCCIVIL);
 QUARVO_TABLE_MODULE(GAPAPPOR);
-QUARVO_TABLE_MODULE(GAPLCOM);
-QUARVO_TABLE_MODULE(GAPLBL);
-QUARVO_TABLE_MODULE(GAPLFAC);
 QUARVO_TABLE_MODULE(SYSAPPLI);
 QUARVO_TABLE_MODULE(SYSCOMPO);
 #undef QUARVO_TABLE_MODULE
@@ -89,9 +88,14 @@ const Module gcpdepot("", "GCPDEPOT-INTERFACE", &fabriquer<Gcpdepot>, false, "")
 const Module gapartfo("", "GAPARTFO-INTERFACE", &fabriquer<Gapartfo>, false, "");
 const Module gapech("", "GAPECH-INTERFACE", &fabriquer<Gapech>, false, "");
 const Module gapedev("", "GAPEDEV-INTERFACE", &fabriquer<PieceGeneration>, false, "");
-const Module gapecom("", "GAPECOM-INTERFACE", &fabriquer<PieceGeneration>, false, "");
-const Module gapebl("", "GAPEBL-INTERFACE", &fabriquer<PieceGeneration>, false, "");
-const Module gapefac("", "GAPEFAC-INTERFACE", &fabriquer<PieceGeneration>, false, "");
+const Module gapecom("", "GAPECOM-INTERFACE", &fabriquer<PieceAchat>, false, "");
+const Module gapebl("", "GAPEBL-INTERFACE", &fabriquer<PieceAchat>, false, "");
+const Module gapefac("", "GAPEFAC-INTERFACE", &fabriquer<PieceAchat>, false, "");
+const Module gaplcom("", "GAPLCOM-INTERFACE", &fabriquer<LignesPiece>, false, "");
+const Module gaplbl("", "GAPLBL-INTERFACE", &fabriquer<LignesPiece>, false, "");
+const Module gaplfac("", "GAPLFAC-INTERFACE", &fabriquer<LignesPiece>, false, "");
+// Time entries.
+const Module afeffo("", "AFEFFO-INTERFACE", &fabriquer<Afeffo>, false, "");
 const host::Source source("SUITE", nullptr);
 
 }  // namespace
