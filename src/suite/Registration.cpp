@@ -1,5 +1,7 @@
 // Registration of the sibling-module stand-ins: each module's "INTERFACE" automaton under the
-// name "<MODULE>-INTERFACE". Table-backed modules share one implementation.
+// name "<MODULE>-INTERFACE". Table-backed modules share one implementation. The piece modules
+// also register their documents' automata, "<MODULE>-GESTION", "-TRF" and "-SOLDER", each one
+// implementation made for the kind (SortesPiece.h).
 #include "host/automate/Automate.h"
 #include "host/automate/Registry.h"
 #include "suite/Action.h"
@@ -21,9 +23,13 @@
 #include "suite/PieceGeneration.h"
 #include "suite/PurchasingServices.h"
 #include "suite/Settling.h"
+#include "suite/SoldePiece.h"
+#include "suite/SortesPiece.h"
 #include "suite/Sysascii.h"
 #include "suite/Sysdroit.h"
 #include "suite/TableInterface.h"
+#include "suite/TransformationPiece.h"
+#include "suite/VuePiece.h"
 #include "suite/Zumndoc.h"
 
 namespace quarvo::suite {
@@ -94,8 +100,29 @@ const Module gapefac("", "GAPEFAC-INTERFACE", &fabriquer<PieceAchat>, false, "")
 const Module gaplcom("", "GAPLCOM-INTERFACE", &fabriquer<LignesPiece>, false, "");
 const Module gaplbl("", "GAPLBL-INTERFACE", &fabriquer<LignesPiece>, false, "");
 const Module gaplfac("", "GAPLFAC-INTERFACE", &fabriquer<LignesPiece>, false, "");
-// Time entries.
+// The pieces' own documents: view, transformation, settling.
+const Module gapecomGestion("", "GAPECOM-GESTION", &fabriquer<DeSorte<VuePiece, kCommandes>>, false,
+                            "");
+const Module gapeblGestion("", "GAPEBL-GESTION", &fabriquer<DeSorte<VuePiece, kReceptions>>, false,
+                           "");
+const Module gapefacGestion("", "GAPEFAC-GESTION", &fabriquer<DeSorte<VuePiece, kFactures>>, false,
+                            "");
+const Module gapecomTrf("", "GAPECOM-TRF", &fabriquer<DeSorte<TransformationPiece, kCommandes>>,
+                        false, "");
+const Module gapeblTrf("", "GAPEBL-TRF", &fabriquer<DeSorte<TransformationPiece, kReceptions>>,
+                       false, "");
+const Module gapefacTrf("", "GAPEFAC-TRF", &fabriquer<DeSorte<TransformationPiece, kFactures>>,
+                        false, "");
+const Module gapecomSolder("", "GAPECOM-SOLDER", &fabriquer<DeSorte<SoldePiece, kCommandes>>, false,
+                           "");
+const Module gapeblSolder("", "GAPEBL-SOLDER", &fabriquer<DeSorte<SoldePiece, kReceptions>>, false,
+                          "");
+const Module gapefacSolder("", "GAPEFAC-SOLDER", &fabriquer<DeSorte<SoldePiece, kFactures>>, false,
+                           "");
+// Time entries: their interface and their own document.
 const Module afeffo("", "AFEFFO-INTERFACE", &fabriquer<Afeffo>, false, "");
+const Module afeffoGestion("", "AFEFFO-GESTION", &fabriquer<DeSorte<VuePiece, kReleves>>, false,
+                           "");
 const host::Source source("SUITE", nullptr);
 
 }  // namespace
