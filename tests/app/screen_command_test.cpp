@@ -9,6 +9,7 @@
 #include "app/Workspace.h"
 #include "host/automate/Edition_etat.h"
 #include "quarvo/report/ReportFixture.h"
+#include "support/TestSession.h"
 
 namespace quarvo {
 namespace {
@@ -100,6 +101,27 @@ TEST(ScreenCommandTest, JsonIsOneObjectPerState) {
   EXPECT_EQ(states[1]["windows"][0]["fields"]["V_MODE"]["value"], "0");
   EXPECT_EQ(states[2]["dialog"]["kind"], "file");
   EXPECT_EQ(states[2]["dialog"]["title"], "Sélection d'un fichier");
+}
+
+TEST(LinkCommandTest, ALinkScriptOnTheDemoAndItsUsageErrors) {
+  test::TestSession t(true);
+  ScreenOptions o;
+  o.script = "-";
+  std::istringstream in("new LST\ncell LST 1 LST_C1 CF26000003\npress B_VALID_DOC\nclose\n");
+  std::ostringstream out;
+  std::ostringstream err;
+  ASSERT_EQ(app::runLink(t.session(), "0000000213", "VMCA", o, in, false, out, err), 0)
+      << out.str() << err.str();
+  EXPECT_NE(out.str().find("> close\nno window open\n"), std::string::npos) << out.str();
+  EXPECT_EQ(t.value("AFLBUD", "VENG", "IDENT", "0000000213"), "3600.00");
+  std::istringstream rien("");
+  EXPECT_THROW(app::runLink(t.session(), "0000009999", "VMCA", o, rien, false, out, err),
+               app::UsageError);
+  EXPECT_THROW(app::runLink(t.session(), "0000000213", "VXZ", o, rien, false, out, err),
+               app::UsageError);
+  // Without the right to create lines, the script's new line is refused: exit 1.
+  std::istringstream nouvelle("new LST\n");
+  EXPECT_EQ(app::runLink(t.session(), "0000000213", "V", o, nouvelle, false, out, err), 1);
 }
 
 }  // namespace

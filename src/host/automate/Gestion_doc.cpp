@@ -75,6 +75,8 @@ void Gestion_doc::executer(Evt* evt) {
   } else {
     EvtParamVal vide;
     raise("DEBUT_FICHE_VIDE", &vide);
+    EvtParamVal liste;
+    raise("LST_LISTE_VIDE", &liste);
     // A document without lines starts a new one, as the runtime does, when lines may be made.
     if (permis('C')) creerLigne();
   }
@@ -187,11 +189,20 @@ bool Gestion_doc::validerLigne() {
 void Gestion_doc::abandonnerLigne() {
   if (nouvelle_) {
     nouvelle_ = false;
+    // Back on the line that was current before the new one was started.
+    if (avantCreation_ != 0) ligne_->aller(avantCreation_);
   } else if (saisie_ && ligne_->courantId() != 0) {
     ligne_->aller(ligne_->courantId());
   }
   saisie_ = false;
   rafraichir();
+  // Back on a line as it was: the document shows it again (and what may be done on it).
+  if (ligne_->courantId() != 0) {
+    EvtParamVal e;
+    raise("DEBUT_LIGNE", &e);
+    EvtParamVal f;
+    raise("AFFICHER_LIGNE", &f);
+  }
 }
 
 void Gestion_doc::visualisation(Evt*) {
@@ -229,6 +240,7 @@ bool Gestion_doc::creerLigne() {
     return false;
   }
   if (!validerLigne()) return false;
+  avantCreation_ = ligne_->courantId();
   nouvelle_ = true;
   ligne_->preparer();
   if (!leverAction("DEBUT_CREATION") || (nouvelle_ && !leverAction("CREATION"))) {

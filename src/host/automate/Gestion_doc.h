@@ -123,6 +123,7 @@ class Gestion_doc : public Fenetre_simple {
   int64_t parametre_ = 0;
   std::string supprime_;
   int redemarrages_ = 0;
+  RowId avantCreation_ = 0;  // the current line when a new one was started
 };
 
 }  // namespace quarvo::host

@@ -2,7 +2,9 @@
 // windows of a session.
 //
 // The model runs its session on a thread of its own, the session thread, for as long as it
-// lives, and is the session's UI driver meanwhile. A driver calls `ouvrir` and `agir` from one
+// lives, and is the session's UI driver meanwhile: one model works a session at a time (make the
+// next one once the last is gone), and the session is not used from another thread while an
+// action runs. A driver calls `ouvrir` and `agir` from one
 // thread of its own, one call at a time; each call hands the work to the session thread and
 // returns once the session waits for a person again:
 // - the action ended (and the work it launched, such as a report, ran);

@@ -558,6 +558,7 @@ void QUARVOGestion::apres_suppression(Evt*) {
   // The time pointing of the row goes with it at the save: abandoning keeps it.
   supprimees_.push_back(identSupprime());
   executer("CALCUL_TOTAUX");
+  executer("INTERDIRE_FONCTIONS");
 }
 
 void QUARVOGestion::dialogue(Evt* evt) {
@@ -998,6 +999,7 @@ void QUARVOGestion::ajouter_piece(Evt* evt) {
   remplirLigne(composant, record);
   executer("AJOUTER_LIGNE");
   executer("CALCUL_TOTAUX");
+  executer("INTERDIRE_FONCTIONS");
   rafraichir();
   vtypeCible_.set(int64_t{0});
   videntCible_.set("");
