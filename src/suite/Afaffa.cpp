@@ -1,5 +1,8 @@
 #include "suite/Afaffa.h"
 
+#include <algorithm>
+
+#include "host/session/Session.h"
 #include "host/table/Table.h"
 
 namespace quarvo::suite {
@@ -8,6 +11,7 @@ using namespace host;
 
 Afaffa::Afaffa(Evt* evt) : TableInterface(evt) {
   addBranch("CONTROLER_SECAN", [this](Evt* e) { controlerSecan(e); });
+  addBranch("CHOIX", [this](Evt* e) { choix(e); });
 }
 
 std::string Afaffa::refus(Table& project, const std::string& section, const Date& date) {
@@ -54,6 +58,32 @@ void Afaffa::controlerSecan(Evt* evt) {
   message1.set(piece.empty() ? heading : "Pièce " + piece + " : section analytique " + section);
   message2.set(why);
   erreurMethode(1, evt);
+}
+
+void Afaffa::choix(Evt* evt) {
+  Field ident("P_IDENT", "", "", 4, Kind::Chaine, Valeur::chaine(""), this);
+  evt->param(0, ident, 1);
+  Table projets(this, "VOVOVA", "AFAFFA", "CHOIX");
+  projets.effacerCriteres();
+  std::vector<std::pair<std::string, std::string>> offerts;  // code, identifier
+  std::vector<std::string> items;
+  while (projets.lire(1) == 0) {
+    offerts.emplace_back(projets.valeur("CODE").toChaine(), projets.valeur("IDENT").toChaine());
+  }
+  std::sort(offerts.begin(), offerts.end());
+  for (const auto& [code, id] : offerts) {
+    projets.chercher(3, "IDENT", '=', Valeur::chaine(id));
+    items.push_back(code + "  " + projets.valeur("DESIG").toChaine());
+  }
+  std::optional<int> chosen;
+  if (!items.empty()) chosen = session().ui().choisir("Choix d'une affaire", items);
+  if (!chosen) {
+    erreurMethode(2, evt);
+    return;
+  }
+  ident.set(offerts[static_cast<size_t>(*chosen - 1)].second);
+  lireDans("IDENT", ident.value());
+  erreurMethode(0, evt);
 }
 
 }  // namespace quarvo::suite

@@ -9,6 +9,9 @@
 // the section ("Pièce CF26000001 : section analytique AFF009"), message 2 says why. On success
 // both messages are emptied. The table, the mode ("1": a purchasing piece) and the object are
 // not used by this stand-in. "LECTURE" and "LECTURE_CODE" read a project (generic).
+// "CHOIX" (project identifier by reference, where the list starts) offers the projects in code
+// order in a choice list; a choice sets the identifier and reads the project into "I_AFAFFA";
+// nothing chosen reports outcome 2 and leaves the identifier.
 #pragma once
 
 #include "suite/TableInterface.h"
@@ -20,6 +23,7 @@ class Afaffa : public TableInterface {
   explicit Afaffa(host::Evt* evt);
 
  private:
+  void choix(host::Evt* evt);
   // Why the project of `section` refuses a piece dated `date`; empty when it accepts it.
   static std::string refus(host::Table& project, const std::string& section,
                            const host::Date& date);

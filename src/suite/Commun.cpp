@@ -23,6 +23,9 @@ void borneDate(Automate& a, Evt* evt) {
   evt->param(1, debut, 1);
   evt->param(2, fin, 1);
   std::string code = evt->valeur(0).toChaine();
+  // The seven period buttons of the selection screens, by number.
+  static const char* const boutons[] = {"J", "S", "M", "MP", "T", "A", "E"};
+  if (code.size() == 1 && code[0] >= '1' && code[0] <= '7') code = boutons[code[0] - '1'];
   Table societe(&a, "VOVOVA", "AFSOCI", "BORNE_DATE");
   if (societe.chercher(3, "CODE", '=', Valeur::chaine(a.session().societe())) != 0) {
     a.erreurMethode(1, evt);
@@ -38,7 +41,19 @@ void borneDate(Automate& a, Evt* evt) {
   Date d = *courant;
   Date from;
   Date to;
-  if (code == "M") {
+  if (code == "J" || code == "S") {
+    // The day (or the week, Monday to Sunday) of the company's current date: today when today
+    // is in the current month, else the month's last day.
+    Date jour = Date::today();
+    if (jour < d || jour > d.lastOfMonth()) jour = d.lastOfMonth();
+    from = jour;
+    to = jour;
+    if (code == "S") {
+      std::chrono::weekday wd{std::chrono::sys_days(jour.ymd())};
+      from = jour.addDays(-static_cast<int>(wd.iso_encoding() - 1));
+      to = from.addDays(6);
+    }
+  } else if (code == "M") {
     from = d;
     to = d.lastOfMonth();
   } else if (code == "MP") {

@@ -18,8 +18,11 @@
 // - "BORNE_DATE" (preset code, first day by reference, last day by reference): the bounds of a
 //   period relative to the company's current month "MOIS_ANNEE" of "AFSOCI": "M" that month,
 //   "MP" the month before, "T" its quarter, "A" its calendar year, "E" the current fiscal year
-//   (first "DATE_DEBUT"/"DATE_FIN" pair). Fails, leaving both dates, for another code or when
-//   the company or its current month cannot be read.
+//   (first "DATE_DEBUT"/"DATE_FIN" pair), "J" the company's current day (today when today is
+//   in the current month, else the month's last day) and "S" its week, Monday to Sunday. The
+//   seven period buttons of the selection screens pass their number: 1 "J", 2 "S", 3 "M",
+//   4 "MP", 5 "T", 6 "A", 7 "E". Fails, leaving both dates, for another code or when the
+//   company or its current month cannot be read.
 // A message number missing from the catalogue is shown as "Message <n>" so nothing is silent.
 #pragma once
 

@@ -1,6 +1,7 @@
-// A plain window: created with its parameters, it runs "INIT" and "DEBUT" (when bound) and then
-// stays open in its session until a handler ends it with `sortir`. Its screen (`ecran()`) is
-// built from the description of `nomEcran()`.
+// A plain window: created with its parameters, it runs "INIT", "AVANT_DEBUT", "DEBUT" and
+// "DEBUT_ACTIVATION" (those bound) and then stays open in its session until a handler ends it
+// with `sortir`; it gets "DEBUT_ACTIVATION" again when an automaton it launched has ended. Its
+// screen (`ecran()`) is built from the description of `nomEcran()`.
 //
 // A person works it through the screen model, which checks each action (the control exists, is
 // enabled, visible and on the current tab; the text converts to the field's kind) and then calls
@@ -10,12 +11,21 @@
 // An outcome a handler reports (`erreurMethode`) is not a refusal: the import window reports
 // that errors were found, having done its work. Document windows override these operations
 // with their own events.
+//
+// A list of the screen may show a table (`listeSur`): its rows are the rows the cursor's
+// criteria select, each column the table column its description names. The window redraws it
+// by program (`afficherListe`), which raises "<list>_LISTE_VIDE" or "<list>_LISTE_PLEINE"; a row
+// chosen puts the cursor on it and raises "<list>_SELECTION"; a cell changed is written to the
+// cursor's row, then the column's label runs with the cursor on that row (its handler updates
+// the row and may refuse, which puts the old value back).
 #pragma once
 
+#include <map>
 #include <string>
 #include <vector>
 
 #include "host/automate/Automate.h"
+#include "host/table/Store.h"
 
 namespace quarvo::host {
 
@@ -47,10 +57,23 @@ class Fenetre_simple : public Automate {
   // them; otherwise, or on yes, the window ends.
   virtual void fermer();
 
+  // A list shown from a table. REQUIRES: `cursor` outlives the window's use of the list.
+  void listeSur(const std::string& list, Table& cursor);
+  // Redraws a list from its table's selection; the current row stays on the same table row when
+  // it is still shown. Returns the number of rows.
+  size_t afficherListe(const std::string& list);
+
  protected:
   // Raises `label` as a person's action does; false when the handler refused it. A label no
   // handler is bound to refuses nothing.
   bool leverAction(const std::string& label);
+
+ private:
+  struct ListeTable {
+    Table* curseur = nullptr;
+    std::vector<RowId> lignes;
+  };
+  std::map<std::string, ListeTable> listesTables_;
 };
 
 }  // namespace quarvo::host

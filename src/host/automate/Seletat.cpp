@@ -1,6 +1,7 @@
 #include "host/automate/Seletat.h"
 
 #include <cmath>
+#include <fstream>
 
 #include "host/Execute.h"
 #include "host/session/Session.h"
@@ -20,6 +21,8 @@ Seletat::Seletat(Evt* creating)
       vaffaChoix_(chaine("VAFFA_CHOIX", "Affaires", "T")),
       vaffaCode_(chaine("VAFFA_CODE", "Affaire")),
       vafebudIdent_(chaine("VAFEBUD_IDENT", "Budget")),
+      vaffaToutes_(chaine("VAFFA_TOUTES", "Affaires", "T")),
+      vaffaIdent_(chaine("VAFFA_IDENT")),
       vservChoix_(chaine("VSERV_CHOIX", "Services", "T")),
       vservCode_(chaine("VSERV_CODE", "Service")),
       vcli_(chaine("VCLI", "Client")),
@@ -39,8 +42,14 @@ Seletat::Seletat(Evt* creating)
       vfichier_(chaine("VFICHIER", "Fichier")) {
   nomEcran("SELETAT");
   addBranch("INIT", [this](Evt* e) { init(e); });
+  addBranch("AVANT_DEBUT", [this](Evt* e) { avant_debut(e); });
   addBranch("DEBUT", [this](Evt* e) { debut(e); });
+  addBranch("DEBUT_ACTIVATION", [this](Evt* e) { debut_activation(e); });
   addBranch("VALID", [this](Evt* e) { valid(e); });
+  addBranch("VAFFA_TOUTES", [this](Evt* e) { vaffa_toutes(e); });
+  addBranch("VAFFA_CODE_CHOISIR", [this](Evt* e) { vaffa_code_choisir(e); });
+  addBranch("BORNE(1,7)", [this](Evt* e) { borne__1__7(e); });
+  addBranch("EXPORTER_LISTE_CSV", [this](Evt* e) { exporter_liste_csv(e); });
   addBranch("VALIDATION", [this](Evt* e) { validation(e); });
   addBranch("VCLASSEMENT_LIB_CHOIX", [this](Evt* e) { vclassement_lib_choix(e); });
   addBranch("VCLASSEMENT_LIB_FERME", [this](Evt* e) { vclassement_lib_ferme(e); });
@@ -61,6 +70,94 @@ void Seletat::valid(Evt* evt) {
   EvtParamVal none;
   Evt* e = evt != nullptr ? evt : &none;
   raise("VALIDATION", e);
+}
+
+void Seletat::vaffa_toutes(Evt*) {
+  if (vaffaToutes_.text() == "T") {
+    vaffaCode_.set("");
+    vaffaIdent_.set("");
+  }
+}
+
+void Seletat::vaffa_code_choisir(Evt* evt) {
+  // The list starts on the project typed, when there is one.
+  EvtParamRef lire{vaffaCode_.value()};
+  Field ident("P_AFFAIRE", "", "", 4, Kind::Chaine, Valeur::chaine(""), this);
+  appelerProcedure("*1", "AFAFFA", "INTERFACE", "LECTURE_CODE", &lire, -1);
+  if (erreurMethode() == 0) {
+    if (auto v = Execute::execute(*this, "I_AFAFFA.IDENT")) ident.assign(*v);
+  }
+  EvtParamRef choix{ref(ident)};
+  appelerProcedure("*1", "AFAFFA", "INTERFACE", "CHOIX", &choix, -1);
+  int code = erreurMethode();
+  if (code == 0) {
+    vaffaToutes_.set("U");
+    if (auto v = Execute::execute(*this, "I_AFAFFA.CODE")) vaffaCode_.assign(*v);
+    vaffaIdent_.assign(ident.value());
+  } else if (code == 2) {
+    vaffaToutes_.set("T");
+    vaffaCode_.set("");
+    vaffaIdent_.set("");
+  }
+  erreurMethode(0, evt);
+}
+
+void Seletat::borne__1__7(Evt* evt) {
+  borne(numeroBranche(), evt);
+}
+
+void Seletat::borne(int numero, Evt* evt) {
+  EvtParamRef borne{val(std::to_string(numero)), ref(vdatemin_), ref(vdatemax_)};
+  appelerProcedure("*", "COMMUN", "INTERFACE", "BORNE_DATE", &borne, -1);
+  erreurMethode(erreurMethode(), evt);
+  reafficher("VDATEMIN");
+  reafficher("VDATEMAX");
+}
+
+void Seletat::exporter_liste_csv(Evt* evt) {
+  std::string list = evt != nullptr && evt->nbParams() > 0 ? evt->valeur(0).toChaine() : "LST";
+  if (list.empty()) list = "LST";
+  auto file = session().ui().choisirFichier("Exporter la liste", "Fichiers CSV (*.csv)|*.csv");
+  if (!file || file->empty()) return;
+  if (!exporterListeCsv(list, *file)) {
+    BoiteDialogue("Attention", "Le fichier " + *file + " n'a pas pu être écrit.", 0, {"$1~OK"});
+    erreurMethode(1, evt);
+  }
+}
+
+bool Seletat::exporterListeCsv(const std::string& list, const std::string& file) {
+  const DescListe* d = ecran().description().liste(list);
+  if (d == nullptr) return false;
+  const ListeEcran& l = ecran().liste(list);
+  auto cellule = [](const std::string& text, bool nombre) {
+    std::string v = text;
+    if (!nombre && !v.empty() && (v[0] == '=' || v[0] == '+' || v[0] == '-' || v[0] == '@')) {
+      v = "'" + v;  // text, not a formula
+    }
+    if (v.find_first_of(";\"\n\r") != std::string::npos) {
+      std::string q = "\"";
+      for (char c : v) q += c == '"' ? std::string("\"\"") : std::string(1, c);
+      v = q + "\"";
+    }
+    return v;
+  };
+  std::ofstream out(file, std::ios::binary);
+  if (!out) return false;
+  for (size_t i = 0; i < d->colonnes.size(); ++i) {
+    out << (i == 0 ? "" : ";")
+        << cellule(d->colonnes[i].entete.empty() ? d->colonnes[i].nom : d->colonnes[i].entete,
+                   false);
+  }
+  out << "\n";
+  for (const auto& row : l.lignes) {
+    for (size_t i = 0; i < row.size() && i < d->colonnes.size(); ++i) {
+      GenreChamp g = d->colonnes[i].genre;
+      bool nombre = g == GenreChamp::Montant || g == GenreChamp::Nombre || g == GenreChamp::Entier;
+      out << (i == 0 ? "" : ";") << cellule(row[i], nombre);
+    }
+    out << "\n";
+  }
+  return static_cast<bool>(out);
 }
 
 void Seletat::vclassement_lib_choix(Evt* evt) {

@@ -10,7 +10,10 @@
 // - "VSELECTION": the one-line summary of the selection, built by "CONSTRUIRE_VSELECTION";
 // - "VJAUGE": the gauge (percentage) shown while the selection runs;
 // - project choice "VAFFA_CHOIX" ("T" all projects, "B" one budget, anything else one project),
-//   "VAFFA_CODE" (project code) and "VAFEBUD_IDENT" (budget identifier);
+//   "VAFFA_CODE" (project code) and "VAFEBUD_IDENT" (budget identifier); for the screens that
+//   choose one project or all, "VAFFA_TOUTES" ("T" all, "U" the one of "VAFFA_CODE" and
+//   "VAFFA_IDENT"): "VAFFA_TOUTES" set to "T" empties the project, "VAFFA_CODE_CHOISIR" offers
+//   the projects ("AFAFFA" "CHOIX") from the one typed;
 // - department choice "VSERV_CHOIX" ("U" one department, whose code is "VSERV_CODE");
 // - range values "VCLI", "VRPS1", "VRPS2", "VCRI1" ... "VCRI5" (empty keeps every code);
 // - budget-state options "VETAT" ("T" all, "A", "NC", "NA", "C"), "VCLOS" and "VCLOS2" ("O"
@@ -21,7 +24,10 @@
 // Its screen is "SELETAT" (db/screens/SELETAT.json); a derived screen names its own, which
 // extends it.
 //
-// Labels it binds: "INIT", "DEBUT", "VALID" (the OK button: raises "VALIDATION"), "VALIDATION",
+// Labels it binds: "INIT", "AVANT_DEBUT", "DEBUT", "DEBUT_ACTIVATION", "VALID" (the OK button:
+// raises "VALIDATION"), "VALIDATION", "VAFFA_TOUTES", "VAFFA_CODE_CHOISIR", "BORNE(1,7)" (the
+// seven period buttons: "COMMUN" "BORNE_DATE" with the button's number, `borne`),
+// "EXPORTER_LISTE_CSV" (parameter 0: the list, "LST" by default: `exporterListeCsv`),
 // "VCLASSEMENT_LIB_CHOIX" (offers the criteria in a choice list), "VCLASSEMENT_LIB_FERME" (sets
 // the criterion's label), "BORNE_DATE", "CONSTRUIRE_VSELECTION" (parameter 0: the parts of the
 // summary, one letter each: "V" period, "A" projects and grouping, "E" budget states, "B"
@@ -39,7 +45,20 @@ class Seletat : public Fenetre_simple {
  public:
   explicit Seletat(Evt* creating);
 
+  virtual void avant_debut(Evt*) {}
+  virtual void debut_activation(Evt*) {}
   virtual void valid(Evt* evt);
+  virtual void vaffa_toutes(Evt* evt);
+  virtual void vaffa_code_choisir(Evt* evt);
+  virtual void exporter_liste_csv(Evt* evt);
+  void borne__1__7(Evt* evt);
+  // Sets the period from period button `numero` (1 to 7) and redisplays it.
+  void borne(int numero, Evt* evt);
+  // Writes the rows a list shows to `file` for a spreadsheet: ";" between cells, UTF-8, the
+  // columns' headers first; amounts and numbers as numbers, any text that a spreadsheet would
+  // run as a formula (starting with "=", "+", "-" or "@") kept as text. False when the file
+  // cannot be written.
+  bool exporterListeCsv(const std::string& list, const std::string& file);
   virtual void vclassement_lib_choix(Evt* evt);
   virtual void vclassement_lib_ferme(Evt* evt);
   void borne_date(Evt* evt);
@@ -67,6 +86,8 @@ class Seletat : public Fenetre_simple {
   Field& vaffaChoix_;
   Field& vaffaCode_;
   Field& vafebudIdent_;
+  Field& vaffaToutes_;
+  Field& vaffaIdent_;
   Field& vservChoix_;
   Field& vservCode_;
   Field& vcli_;

@@ -54,7 +54,11 @@ class Essai : public Fenetre_simple {
       lancerModule("", "TEST", "TEST-ENFANT", &params);
       journal("lancé");
     });
-    addBranch("DEBUT_ACTIVATION", [this](Evt*) { journal("réactivée"); });
+    // Told once when it opens, then again each time a window it launched has ended.
+    addBranch("DEBUT_ACTIVATION", [this](Evt*) {
+      if (active_) journal("réactivée");
+      active_ = true;
+    });
     addBranch("ECRIRE", [this](Evt*) {
       Transaction tx(session().db());
       Table t(this, "VOVOVA", "AFPARA", "ESSAI");
@@ -97,6 +101,7 @@ class Essai : public Fenetre_simple {
   Field& vchoix_;
   Field& vp2_;
   Field& vjournal_;
+  bool active_ = false;
 };
 
 // The window another opens: its result goes back through the parameter it was given.
