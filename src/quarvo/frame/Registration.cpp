@@ -11,6 +11,8 @@
 #include "quarvo/import/QUARVOImporter.h"
 #include "quarvo/import/QUARVOImporter_auto.h"
 #include "quarvo/import/QUARVOSolder.h"
+#include "quarvo/imputation/QUARVOImputer.h"
+#include "quarvo/imputation/QUARVOImputer1.h"
 #include "quarvo/imputation/QUARVOImputer_auto.h"
 #include "quarvo/imputation/QUARVOImputer_pieces.h"
 #include "quarvo/imputation/QUARVOPointer_pieces.h"
@@ -81,6 +83,8 @@ const Source sourceE("QUARVO", nullptr);
 
 // Unit F: imputation and pointing.
 const Global globalF("COMMUN", "QUARVO");
+const Module imputer1("", "QUARVO-IMPUTER1", &fabriquer<QUARVOImputer1>, false, "");
+const Module imputer("", "QUARVO-IMPUTER", &fabriquer<QUARVOImputer>, false, "");
 const Module imputerAuto("", "QUARVO-IMPUTER_AUTO", &fabriquer<QUARVOImputer_auto>, false, "");
 const Module imputerPieces("", "QUARVO-IMPUTER_PIECES", &fabriquer<QUARVOImputer_pieces>, false,
                            "");
