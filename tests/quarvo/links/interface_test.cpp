@@ -168,9 +168,9 @@ TEST_F(InterfaceTest, RightsAndFolderChecksBeforeAnythingOpens) {
   EXPECT_EQ(call("VERIF_DROITS", {val("Z")}), 1);
   EXPECT_NE(t_.ui().transcriptText().find("[38]"), std::string::npos);
   t_.ui().clear();
-  // Screens not built yet: the checks pass and the launch says clearly what is missing.
-  EXPECT_EQ(call("IMPUTER", {}), 1);
-  EXPECT_NE(t_.ui().transcriptText().find("QUARVO-IMPUTER"), std::string::npos);
+  // The checks pass and the screen is launched.
+  EXPECT_EQ(call("IMPUTER", {}), 0);
+  EXPECT_EQ(t_.ui().transcriptText().find("INCIDENT"), std::string::npos);
   t_.ui().clear();
   t_.sql("DELETE FROM \"SYSCOMPO\"");
   EXPECT_EQ(call("IMPORTER", {}), 1);
