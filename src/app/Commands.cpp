@@ -241,8 +241,15 @@ Commande imputeCommand(CLI::App& cli) {
   app->add_flag("--arbitration", o->arbitration,
                 "First suitable budget line wins; a missing one is created");
   app->add_flag("--dry-run", o->dryRun, "Point only and print the proposal");
-  return {app, Commande::Base::Ouverte, true,
-          [o](Contexte& c) { return runImpute(*c.session, *o, c.out); }};
+  app->add_flag("--review", o->review,
+                "The imputation selection screen advanced to its proposal, printed; with "
+                "--script, actions played on it (open a piece, split it, validate)");
+  app->add_option("--script", o->script, "With --review: file of screen actions ('-' stdin)");
+  return {app, Commande::Base::Ouverte, true, [o](Contexte& c) {
+            if (o->script && !o->review) throw UsageError("--script goes with --review");
+            if (o->review) return runImputeReview(*c.session, *o, std::cin, c.out, c.err);
+            return runImpute(*c.session, *o, c.out);
+          }};
 }
 
 Commande importCommand(CLI::App& cli) {

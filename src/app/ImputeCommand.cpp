@@ -3,6 +3,8 @@
 #include <ostream>
 
 #include "app/Console.h"
+#include "app/PiloteEcran.h"
+#include "app/ScreenCommand.h"
 #include "app/Workspace.h"
 #include "host/UException.h"
 #include "host/automate/Automate.h"
@@ -148,6 +150,92 @@ int imputer(Session& s, const ImputeOptions& o, std::ostream& out) {
 }
 
 }  // namespace
+
+int runImputeReview(Session& s, const ImputeOptions& o, std::istream& in, std::ostream& out,
+                    std::ostream& err) {
+  if (o.arbitration || o.dryRun) {
+    throw UsageError(
+        "--review shows the proposal on the screen: not with --arbitration or "
+        "--dry-run");
+  }
+  std::string kind = o.kind.value_or("T");
+  if (kind != "T" && kind != "C" && kind != "B" && kind != "F") {
+    throw UsageError("--kind must be T, C, B or F, not '" + kind + "'");
+  }
+  if (o.to && o.to->empty()) throw UsageError("--to may not be empty: the period needs its end");
+  std::string min, max;
+  if (o.numbers) {
+    auto colon = o.numbers->find(':');
+    if (colon == std::string::npos) throw UsageError("--numbers expects MIN:MAX");
+    min = o.numbers->substr(0, colon);
+    max = o.numbers->substr(colon + 1);
+  }
+  std::string from = dateOption(o.from, "from");
+  std::string to = o.to ? dateOption(o.to, "to") : "";
+  std::vector<LigneScript> script;
+  if (o.script) script = lireScript(*o.script, in);
+
+  UiDriver& terminal = s.ui();
+  ModeleEcran model(s, &terminal, true);
+  if (model.ouvrir("QUARVO-IMPUTER") != ModeleEcran::Ouverture::Ouverte) {
+    throw UsageError("the imputation selection QUARVO-IMPUTER could not be opened");
+  }
+  PiloteEcran screen(model, terminal);
+  auto poser = [&](const std::string& field, const std::string& value) {
+    if (!screen.saisir(field, value)) {
+      throw UsageError("the imputation selection refuses " + field + " = '" + value +
+                       "': " + screen.refus());
+    }
+  };
+  if (o.from) poser("VDATEMIN", from);
+  if (o.to) poser("VDATEMAX", to);
+  poser("VTYPE_PIECE", kind);
+  poser("VNUMMIN", min);
+  poser("VNUMMAX", max);
+  if (o.project) {
+    poser("VAFFA_TOUTES", "U");
+    poser("VAFFA_CODE", *o.project);
+  }
+  Action avancer;
+  avancer.genre = Action::Genre::Presser;
+  avancer.cible = "AVANCER";
+  if (!model.agir(avancer)) {
+    out << "the imputation selection refused the proposal: " << screen.refus() << "\n";
+    return 1;
+  }
+  if (!o.script) {
+    Action oui;
+    oui.genre = Action::Genre::Repondre;
+    oui.valeur = "1";
+    if (model.etat().dialogue && !model.agir(oui)) {
+      out << "the pointing was refused: " << screen.refus() << "\n";
+      return 1;
+    }
+    printProposal(out);
+    Bilan b = bilan();
+    out << "Pieces pointed: " << b.pointees << "; imputable: " << b.imputables
+        << "; in error: " << b.pointees - b.imputables << " (nothing written)\n";
+    return 0;
+  }
+  // The screen empties its work tables when it closes: what was written is read in the links.
+  auto liens = [] {
+    std::pair<int64_t, Monnaie> total{0, Monnaie()};
+    Table t(nullptr, "VOVOVA", "QUARVO", "REVUE");
+    t.ouvrir();
+    while (t.lire(1) == 0) {
+      ++total.first;
+      total.second += toMonnaie(t.valeur("HT"));
+    }
+    return total;
+  };
+  auto avant = liens();
+  int rc = jouerScript(model, script, false, out, err);
+  model.fermerTout();
+  auto apres = liens();
+  out << "Link rows written: " << apres.first - avant.first << " new (linked amount "
+      << (apres.second - avant.second).text() << ")\n";
+  return rc;
+}
 
 int runImpute(Session& s, const ImputeOptions& o, std::ostream& out) {
   try {

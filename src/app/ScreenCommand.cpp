@@ -13,16 +13,14 @@ using namespace host;
 
 namespace {
 
-struct Ligne {
-  size_t numero;
-  std::string texte;
-  Action action;
-};
+constexpr const char* kAide =
+    "actions: set FIELD VALUE | cell LIST ROW COLUMN VALUE | select LIST ROW | tab NAME | "
+    "press BUTTON | new LIST | delete LIST ROW | answer N|TEXT|PATH | close; quit ends\n";
 
-// Every action of a script, read before any is played: a script that does not read as actions
-// changes nothing.
-std::vector<Ligne> lireScript(std::istream& in, const std::string& source) {
-  std::vector<Ligne> lignes;
+}  // namespace
+
+std::vector<LigneScript> lireScript(std::istream& in, const std::string& source) {
+  std::vector<LigneScript> lignes;
   std::string line;
   size_t numero = 0;
   while (std::getline(in, line)) {
@@ -38,34 +36,48 @@ std::vector<Ligne> lireScript(std::istream& in, const std::string& source) {
   return lignes;
 }
 
-constexpr const char* kAide =
-    "actions: set FIELD VALUE | cell LIST ROW COLUMN VALUE | select LIST ROW | tab NAME | "
-    "press BUTTON | new LIST | delete LIST ROW | answer N|TEXT|PATH | close; quit ends\n";
+std::vector<LigneScript> lireScript(const std::string& file, std::istream& standard) {
+  if (file == "-") return lireScript(standard, "the standard input");
+  std::ifstream in(file);
+  if (!in) throw UsageError("cannot read the script " + file);
+  return lireScript(in, file);
+}
 
-}  // namespace
+void imprimerEtat(const EtatEcrans& etat, bool json, std::ostream& out) {
+  if (json) {
+    out << enJson(etat) << "\n";
+  } else {
+    out << enTexte(etat);
+  }
+  out.flush();
+}
+
+int jouerScript(ModeleEcran& model, const std::vector<LigneScript>& script, bool json,
+                std::ostream& out, std::ostream& err) {
+  for (const auto& ligne : script) {
+    if (!json) out << "> " << ligne.texte << "\n";
+    bool accepted = model.agir(ligne.action);
+    imprimerEtat(model.etat(), json, out);
+    if (!accepted) {
+      err << "line " << ligne.numero
+          << ": refused: " << (model.etat().refus ? model.etat().refus->texte : std::string("?"))
+          << "\n";
+      return 1;
+    }
+  }
+  return 0;
+}
 
 int runScreen(Session& session, const ScreenOptions& o, std::istream& in, bool interactive,
               std::ostream& out, std::ostream& err) {
-  std::vector<Ligne> script;
+  std::vector<LigneScript> script;
   bool prompt = false;
-  if (!o.script.empty() && o.script != "-") {
-    std::ifstream file(o.script);
-    if (!file) throw UsageError("cannot read the script " + o.script);
-    script = lireScript(file, o.script);
-  } else if (o.script == "-" || !interactive) {
-    script = lireScript(in, "the standard input");
+  if (!o.script.empty() || !interactive) {
+    script = lireScript(o.script.empty() ? "-" : o.script, in);
   } else {
     prompt = true;
   }
-
-  auto imprimer = [&](const EtatEcrans& etat) {
-    if (o.json) {
-      out << enJson(etat) << "\n";
-    } else {
-      out << enTexte(etat);
-    }
-    out.flush();
-  };
+  auto imprimer = [&](const EtatEcrans& etat) { imprimerEtat(etat, o.json, out); };
 
   // The waiting box goes to the terminal as a progress bar; everything else is in the state.
   ModeleEcran model(session, &session.ui(), false);

@@ -22,8 +22,28 @@
 #include <vector>
 
 #include "host/session/Session.h"
+#include "host/ui/ModeleEcran.h"
 
 namespace quarvo::app {
+
+// One action of a script, with its line for messages.
+struct LigneScript {
+  size_t numero;
+  std::string texte;
+  host::Action action;
+};
+
+// Every action of a script read before any is played (a script that does not read as actions
+// changes nothing): a UsageError names the first line that is not an action. `file` "-" reads
+// `standard`.
+std::vector<LigneScript> lireScript(std::istream& in, const std::string& source);
+std::vector<LigneScript> lireScript(const std::string& file, std::istream& standard);
+// Prints a state as `screen` does: text, or one JSON object on a line.
+void imprimerEtat(const host::EtatEcrans& etat, bool json, std::ostream& out);
+// Plays the actions in order, printing the state after each (text mode names each action
+// first); stops at the first refusal, which goes to `err` with its line: returns 1, else 0.
+int jouerScript(host::ModeleEcran& model, const std::vector<LigneScript>& script, bool json,
+                std::ostream& out, std::ostream& err);
 
 struct ScreenOptions {
   std::string name;
