@@ -95,21 +95,25 @@ class ModeleEcran::Pilote : public UiDriver {
 
   void attenteTitre(const std::string& title) override {
     m_.progression_ = EtatProgression{title, {}, 0, 0};
+    suivre();
     if (m_.echo_ != nullptr) m_.echo_->attenteTitre(title);
   }
   void attenteLibelle(const std::string& text) override {
     if (!m_.progression_) m_.progression_ = EtatProgression{};
     m_.progression_->texte = text;
+    suivre();
     if (m_.echo_ != nullptr) m_.echo_->attenteLibelle(text);
   }
   void attenteJauge(int64_t done, int64_t total) override {
     if (!m_.progression_) m_.progression_ = EtatProgression{};
     m_.progression_->fait = done;
     m_.progression_->total = total;
+    suivre();
     if (m_.echo_ != nullptr) m_.echo_->attenteJauge(done, total);
   }
   void attenteFin() override {
     m_.progression_.reset();
+    suivre();
     if (m_.echo_ != nullptr) m_.echo_->attenteFin();
   }
   void incident(const std::string& text) override {
@@ -119,6 +123,9 @@ class ModeleEcran::Pilote : public UiDriver {
   }
 
  private:
+  void suivre() {
+    if (m_.suivi_) m_.suivi_(m_.progression_);
+  }
   // A person may take minutes to answer: meanwhile no write may hold the database.
   void sansEcriture(const std::string& what) {
     if (m_.session_.db().depth() > 0) {

@@ -73,6 +73,12 @@ class ModeleEcran {
 
   // The state as it was when the last call returned.
   const EtatEcrans& etat() const { return etat_; }
+  // Called on the session thread each time the waiting box changes while an action runs (its
+  // title, text, done and total; nothing when it closes): live progress for a driver that shows
+  // it as it goes (the web page pushes it). Set it between two calls.
+  void suivreProgression(std::function<void(const std::optional<EtatProgression>&)> suivi) {
+    suivi_ = std::move(suivi);
+  }
   // What a command reads of a window once it has closed: the last window that closed, its
   // fields as text by name, and its outcome.
   const std::map<std::string, std::string>& champsFermes() const { return champsFermes_; }
@@ -131,6 +137,7 @@ class ModeleEcran {
   std::optional<EtatRefus> refus_;
   std::optional<EtatDialogue> dialogue_;
   std::optional<EtatProgression> progression_;
+  std::function<void(const std::optional<EtatProgression>&)> suivi_;
   std::map<std::string, std::string> fermes_;
   int resultat_ = 0;
   int boucles_ = 0;

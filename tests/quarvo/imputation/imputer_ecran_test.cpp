@@ -154,7 +154,16 @@ TEST_F(ImputerEcranTest, AnUnbalancedPieceIsNotLinkedAndAbandonPutsAllocationsBa
 }
 
 TEST_F(ImputerEcranTest, TheErrorListExportsForASpreadsheetAndTheDetailNeedsItsPiece) {
+  // The pointing's waiting box goes by live, piece after piece.
+  std::vector<std::string> vus;
+  m_->suivreProgression([&vus](const std::optional<host::EtatProgression>& p) {
+    if (p && p->total > 0)
+      vus.push_back(p->titre + " " + std::to_string(p->fait) + "/" + std::to_string(p->total));
+  });
   proposer();
+  ASSERT_FALSE(vus.empty());
+  EXPECT_EQ(vus.back(), "Traitement de la table GAPECOM 4/4");
+  EXPECT_FALSE(m_->etat().progression);  // closed once the pointing ended
   t_.sql(R"(INSERT INTO "IMM_ERREUR" ("IDENT", "COMPOSANT", "CODE", "DESIG", "CMT")
             VALUES ('0000000901', 'GAPECOM', 'CF26000009', '=SOMME(A1:A9)', 'Montant ; 12,5'))");
   ASSERT_EQ(jouer("press AVANCER"), "ok");
