@@ -5,6 +5,7 @@
 #include "host/automate/Automate.h"
 #include "host/automate/Registry.h"
 #include "quarvo/analysis/QUARVOAnalyser.h"
+#include "quarvo/analysis/QUARVOAnnuler.h"
 #include "quarvo/analysis/QUARVOAnnuler1.h"
 #include "quarvo/import/QUARVOImport_controler.h"
 #include "quarvo/import/QUARVOImport_generer.h"
@@ -42,6 +43,7 @@ const Source sourceA("QUARVO", nullptr);
 // Unit B: cancellation.
 const Global globalB("COMMUN", "QUARVO");
 const Module annuler1("", "QUARVO-ANNULER1", &fabriquer<QUARVOAnnuler1>, false, "");
+const Module annuler("", "QUARVO-ANNULER", &fabriquer<QUARVOAnnuler>, false, "");
 const Source sourceB("QUARVO", nullptr);
 
 // Unit C: link document and downstream chaining lookup.
