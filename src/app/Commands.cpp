@@ -12,6 +12,7 @@
 #include <optional>
 
 #include "app/AnalyseCommand.h"
+#include "app/CancelCommand.h"
 #include "app/Demo.h"
 #include "app/FiguresCommand.h"
 #include "app/GenerateCommand.h"
@@ -204,6 +205,46 @@ Commande pieceCommand(CLI::App& cli, const char* name, const char* description,
   app->add_option("IDENT", *ident, "Identifier or document number of the piece")->required();
   return {app, Commande::Base::Ouverte, true,
           [kind, ident, action](Contexte& c) { return action(*c.session, *kind, *ident, c.out); }};
+}
+
+// "cancel KIND IDENT" (one piece) or "cancel [--from D] ..." (the cancellation selection).
+Commande cancelCommand(CLI::App& cli) {
+  auto kind = std::make_shared<std::string>();
+  auto ident = std::make_shared<std::string>();
+  auto selection = std::make_shared<CancelSelection>();
+  auto options = std::make_shared<std::vector<CLI::Option*>>();
+  auto* app = cli.add_subcommand(
+      "cancel",
+      "Remove every link of one purchasing piece (KIND IDENT), or of the linked pieces of a "
+      "selection (the cancellation selection screen)");
+  app->add_option("KIND", *kind, "Piece kind: GAPECOM, GAPEBL, GAPEFAC or CF, BF, FF");
+  app->add_option("IDENT", *ident, "Identifier or document number of the piece");
+  options->push_back(app->add_option("--from", selection->from, "Lowest piece date"));
+  options->push_back(
+      app->add_option("--to", selection->to, "Highest piece date (default: end of month)"));
+  options->push_back(app->add_option("--kind", selection->kind,
+                                     "T all, C orders, B receipts, "
+                                     "F invoices"));
+  options->push_back(app->add_option("--numbers", selection->numbers, "Document numbers MIN:MAX"));
+  options->push_back(app->add_option("--project", selection->project, "Project code"));
+  options->push_back(
+      app->add_option("--keep", selection->keep, "Piece number listed but kept (repeat)"));
+  options->push_back(
+      app->add_flag("--dry-run", selection->dryRun, "List the pieces and cancel nothing"));
+  return {app, Commande::Base::Ouverte, true, [kind, ident, selection, options](Contexte& c) {
+            bool flags = std::any_of(options->begin(), options->end(),
+                                     [](const CLI::Option* o) { return o->count() > 0; });
+            if (!kind->empty() || !ident->empty()) {
+              if (flags) {
+                throw UsageError(
+                    "cancel KIND IDENT cancels one piece; the selection options "
+                    "(--from, --to, --kind, ...) go without KIND IDENT");
+              }
+              if (ident->empty()) throw UsageError("cancel KIND IDENT: the piece is missing");
+              return runCancel(*c.session, *kind, *ident, c.out);
+            }
+            return runCancelSelection(*c.session, *selection, c.out);
+          }};
 }
 
 Commande recomputeCommand(CLI::App& cli) {
@@ -408,7 +449,7 @@ int runCommandLine(int argc, char** argv, std::ostream& out, std::ostream& err) 
       pieceCommand(cli, "analyse",
                    "Check that a purchasing piece can be carried into the accounting link",
                    runAnalyse),
-      pieceCommand(cli, "cancel", "Remove every link of one purchasing piece", runCancel),
+      cancelCommand(cli),
       recomputeCommand(cli),
       checkCommand(cli),
       imputeCommand(cli),

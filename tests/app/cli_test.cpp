@@ -117,6 +117,10 @@ TEST_F(CliTest, RunPrintsResultsAndOutcome) {
   EXPECT_EQ(quarvo("screen QUARVO-NOTHING --script " + (dir_ / "s.txt").string()).code, 2);
   EXPECT_EQ(quarvo("--answer 1 screen QUARVO-SELETAT1 --script " + (dir_ / "s.txt").string()).code,
             2);
+  // The cancellation: one piece, or a selection, never both at once.
+  EXPECT_EQ(quarvo("cancel CF CF26000001 --from 01/01/2026").code, 2);
+  Result liste = quarvo("cancel --dry-run");
+  EXPECT_EQ(liste.code, 0) << liste.out;
   Result screen = quarvo("screen QUARVO-SELETAT1 --json --script " + (dir_ / "s.txt").string());
   EXPECT_EQ(screen.code, 0) << screen.out;
   EXPECT_EQ(screen.out.rfind("{\"version\":1,\"windows\":[{\"screen\":\"SELETAT1\"", 0), 0u);

@@ -103,9 +103,11 @@ void Automate::addBranch(const std::string& label, Handler handler) {
     branches_.push_back(Branch{label, std::move(handler), 0, {}});
     return;
   }
-  // "TRANSFORMER(3,4)": one handler reached by "TRANSFORMER3" and "TRANSFORMER4".
+  // "TRANSFORMER(3,4)": one handler reached by "TRANSFORMER3" and "TRANSFORMER4"; "BORNE(1,7)"
+  // by the seven labels "BORNE1" to "BORNE7": two numbers are the first and the last of a range.
   std::string stem = label.substr(0, open);
   std::string list = label.substr(open + 1, label.size() - open - 2);
+  std::vector<int> numbers;
   size_t start = 0;
   while (start <= list.size()) {
     size_t comma = list.find(',', start);
@@ -113,10 +115,17 @@ void Automate::addBranch(const std::string& label, Handler handler) {
         list.substr(start, comma == std::string::npos ? std::string::npos : comma - start);
     int n = 0;
     std::from_chars(item.data(), item.data() + item.size(), n);
-    branches_.push_back(Branch{stem + std::to_string(n), handler, n, label});
+    numbers.push_back(n);
     if (comma == std::string::npos) break;
     start = comma + 1;
   }
+  if (numbers.size() == 2 && numbers[1] > numbers[0]) {
+    int first = numbers[0];
+    int last = numbers[1];
+    numbers.clear();
+    for (int n = first; n <= last; ++n) numbers.push_back(n);
+  }
+  for (int n : numbers) branches_.push_back(Branch{stem + std::to_string(n), handler, n, label});
 }
 
 void Automate::lierParametres(Evt* evt, std::initializer_list<std::pair<Field*, int>> params) {

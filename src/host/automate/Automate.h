@@ -85,7 +85,8 @@ class Automate {
   // Dispatch. Returns false when no branch is bound to `label`.
   bool hasBranch(const std::string& label) const;
   bool raise(const std::string& label, Evt* evt);
-  // The number of the numbered label that ran last ("TRANSFORMER4" → 4).
+  // The number of the numbered label that ran last ("TRANSFORMER4" → 4). A label declared with
+  // two numbers ("BORNE(1,7)") binds every number from the first to the last.
   int numeroBranche() const { return numero_; }
 
   // Outcomes.

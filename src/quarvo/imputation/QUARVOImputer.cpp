@@ -92,6 +92,14 @@ void QUARVOImputer::avant_debut(Evt* evt) {
 
 void QUARVOImputer::debut(Evt* evt) {
   Seletat::debut(evt);
+  // The work tables are the session's: the cancellation selection would share them.
+  for (Automate* w : session().fenetresModales()) {
+    if (w->nomAutomate() == "QUARVO-ANNULER") {
+      frame::messageOk(*this, vChoix_, "19", {"d'annulation des imputations"});
+      sortir();
+      return;
+    }
+  }
   if (appeler(*this, "AFSOCI", "LECTURE_CODE", {val("SOCIETE")}) != 0) {
     message("14");
     sortir();

@@ -84,6 +84,12 @@ class ImputerEcranTest : public ::testing::Test {
 TEST_F(ImputerEcranTest, APieceSplitOverThreeBudgetLinesIsLinkedAsSplit) {
   // The tabs move only with the buttons: the pointing is never skipped.
   EXPECT_EQ(jouer("tab P3"), "refused on ONGLET: ONGLET est inactif.");
+  // The seven period buttons: the fourth is the month before the company's current one.
+  EXPECT_EQ(jouer("press BORNE4"), "ok");
+  EXPECT_EQ(test::champ(*m_, "VDATEMIN") + "-" + test::champ(*m_, "VDATEMAX"),
+            "01/11/2026-30/11/2026");
+  EXPECT_EQ(jouer("press BORNE6"), "ok");  // the calendar year
+  EXPECT_EQ(test::champ(*m_, "VDATEMIN"), "01/01/2026");
   EXPECT_EQ(jouer("set VDATEMAX"),
             "refused on VDATEMAX: [65] La date de fin de période est obligatoire. | [65] La date "
             "de fin de période est obligatoire.");
