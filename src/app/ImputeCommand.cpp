@@ -25,6 +25,14 @@ std::string dateOption(const std::optional<std::string>& text, const char* name)
   return d->text();
 }
 
+// The document number range of --numbers MIN:MAX (either side may be empty).
+std::pair<std::string, std::string> bornesNumeros(const ImputeOptions& o) {
+  if (!o.numbers) return {};
+  auto colon = o.numbers->find(':');
+  if (colon == std::string::npos) throw UsageError("--numbers expects MIN:MAX");
+  return {o.numbers->substr(0, colon), o.numbers->substr(colon + 1)};
+}
+
 // The last day of the company's current month: the default upper date, as on the screen.
 std::string finDuMoisCourant(Session& s) {
   Table company(nullptr, "VOVOVA", "AFSOCI", "PERIODE");
@@ -110,13 +118,7 @@ int imputer(Session& s, const ImputeOptions& o, std::ostream& out) {
     if (kind != "T" && kind != "C" && kind != "B" && kind != "F") {
       throw UsageError("--kind must be T, C, B or F, not '" + kind + "'");
     }
-    std::string min, max;
-    if (o.numbers) {
-      auto colon = o.numbers->find(':');
-      if (colon == std::string::npos) throw UsageError("--numbers expects MIN:MAX");
-      min = o.numbers->substr(0, colon);
-      max = o.numbers->substr(colon + 1);
-    }
+    auto [min, max] = bornesNumeros(o);
     for (const char* work : {"M_EAPPR", "M_LAPPR", "M_VAPPR"}) s.memoire(work).clear();
     EvtParamVal selection{val(dateOption(o.from, "from")),
                           val(o.to ? dateOption(o.to, "to") : finDuMoisCourant(s)),
@@ -163,13 +165,7 @@ int runImputeReview(Session& s, const ImputeOptions& o, std::istream& in, std::o
     throw UsageError("--kind must be T, C, B or F, not '" + kind + "'");
   }
   if (o.to && o.to->empty()) throw UsageError("--to may not be empty: the period needs its end");
-  std::string min, max;
-  if (o.numbers) {
-    auto colon = o.numbers->find(':');
-    if (colon == std::string::npos) throw UsageError("--numbers expects MIN:MAX");
-    min = o.numbers->substr(0, colon);
-    max = o.numbers->substr(colon + 1);
-  }
+  auto [min, max] = bornesNumeros(o);
   std::string from = dateOption(o.from, "from");
   std::string to = o.to ? dateOption(o.to, "to") : "";
   std::vector<LigneScript> script;

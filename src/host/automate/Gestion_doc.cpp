@@ -70,17 +70,21 @@ void Gestion_doc::executer(Evt* evt) {
   raise("DEBUT", e);
   if (termine()) return;
   rafraichir();
+  // A document without lines starts a new one, as the runtime does, when lines may be made.
+  if (!montrerPremiereLigne() && permis('C')) creerLigne();
+  rafraichir();
+}
+
+bool Gestion_doc::montrerPremiereLigne() {
   if (!affichees_.empty()) {
     devenirCourante(0);
-  } else {
-    EvtParamVal vide;
-    raise("DEBUT_FICHE_VIDE", &vide);
-    EvtParamVal liste;
-    raise("LST_LISTE_VIDE", &liste);
-    // A document without lines starts a new one, as the runtime does, when lines may be made.
-    if (permis('C')) creerLigne();
+    return true;
   }
-  rafraichir();
+  EvtParamVal vide;
+  raise("DEBUT_FICHE_VIDE", &vide);
+  EvtParamVal liste;
+  raise("LST_LISTE_VIDE", &liste);
+  return false;
 }
 
 void Gestion_doc::charger() {
@@ -383,11 +387,10 @@ void Gestion_doc::valid_doc(Evt* evt) {
     t.aller(*it);
     if (t.valeur(kCle).toChaine() == courant) break;
   }
-  if (!affichees_.empty()) {
-    devenirCourante(it != affichees_.end() ? static_cast<size_t>(it - affichees_.begin()) : 0);
+  if (it != affichees_.end()) {
+    devenirCourante(static_cast<size_t>(it - affichees_.begin()));
   } else {
-    EvtParamVal vide;
-    raise("DEBUT_FICHE_VIDE", &vide);
+    montrerPremiereLigne();
   }
   rafraichir();
 }
@@ -436,12 +439,7 @@ void Gestion_doc::aband_doc(Evt*) {
   abandonnerLigne();
   charger();
   rafraichir();
-  if (!affichees_.empty()) {
-    devenirCourante(0);
-  } else {
-    EvtParamVal vide;
-    raise("DEBUT_FICHE_VIDE", &vide);
-  }
+  montrerPremiereLigne();
   rafraichir();
 }
 
@@ -452,7 +450,7 @@ void Gestion_doc::redemarre(Evt* evt) {
   EvtParamVal none;
   raise("DEBUT", evt != nullptr ? evt : &none);
   rafraichir();
-  if (!affichees_.empty()) devenirCourante(0);
+  montrerPremiereLigne();
   rafraichir();
 }
 

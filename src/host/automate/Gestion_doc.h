@@ -107,6 +107,9 @@ class Gestion_doc : public Fenetre_simple {
   bool choisirLigne(size_t row);
   void charger();
   void devenirCourante(size_t index);
+  // The first line shown becomes current; without one, the document says it is empty
+  // ("DEBUT_FICHE_VIDE", "LST_LISTE_VIDE"). False when there is none.
+  bool montrerPremiereLigne();
   bool quitter();
 
   Field* valeurCle_ = nullptr;

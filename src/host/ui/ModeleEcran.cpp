@@ -52,6 +52,25 @@ std::string guillemets(const std::string& text) {
   return "« " + text + " »";
 }
 
+// The caller's side of an opening: one text field per parameter, passed by reference as a menu
+// passes them.
+struct ChampsAppelant {
+  std::vector<std::unique_ptr<Field>> fields;
+  EvtParamRef evt;
+  explicit ChampsAppelant(const std::vector<std::string>& params) : evt(arguments(params)) {}
+
+ private:
+  std::vector<Arg> arguments(const std::vector<std::string>& params) {
+    std::vector<Arg> args;
+    for (size_t i = 0; i < params.size(); ++i) {
+      fields.push_back(std::make_unique<Field>("ARG" + std::to_string(i), "", "", 4, Kind::Chaine,
+                                               Valeur::chaine(params[i]), nullptr));
+      args.push_back(fields.back().get());
+    }
+    return args;
+  }
+};
+
 }  // namespace
 
 // The session's UI driver while the model lives; runs on the session thread.
@@ -257,16 +276,10 @@ ModeleEcran::Ouverture ModeleEcran::ouvrir(const std::string& name,
   size_t avant = etat_.fenetres.size();
   soumettre([this, name, params] {
     ouverture_ = Ouverture::Refusee;
-    // The caller's fields, passed by reference as a menu passes them; they live as long as the
-    // window, since this work ends only when the window has closed.
-    std::vector<std::unique_ptr<Field>> fields;
-    std::vector<Arg> args;
-    for (size_t i = 0; i < params.size(); ++i) {
-      fields.push_back(std::make_unique<Field>("ARG" + std::to_string(i), "", "", 4, Kind::Chaine,
-                                               Valeur::chaine(params[i]), nullptr));
-      args.push_back(fields.back().get());
-    }
-    EvtParamRef evt(args);
+    // The caller's fields live as long as the window, since this work ends only when the
+    // window has closed.
+    ChampsAppelant appelant(params);
+    EvtParamRef& evt = appelant.evt;
     AutomatePtr automate = session_.creer(name, &evt);
     if (!automate) {
       ouverture_ = Ouverture::Inconnue;
@@ -308,14 +321,8 @@ ModeleEcran::Ouverture ModeleEcran::appeler(const std::string& module, const std
   if (!Registry::instance().find(module + "-INTERFACE")) return Ouverture::Inconnue;
   size_t avant = etat_.fenetres.size();
   soumettre([this, module, label, params] {
-    std::vector<std::unique_ptr<Field>> fields;
-    std::vector<Arg> args;
-    for (size_t i = 0; i < params.size(); ++i) {
-      fields.push_back(std::make_unique<Field>("ARG" + std::to_string(i), "", "", 4, Kind::Chaine,
-                                               Valeur::chaine(params[i]), nullptr));
-      args.push_back(fields.back().get());
-    }
-    EvtParamRef evt(args);
+    ChampsAppelant appelant(params);
+    EvtParamRef& evt = appelant.evt;
     int boucles = boucles_;
     session_.appelerProcedure(module, label, &evt);
     // The window the label launched opens when the launched work runs.

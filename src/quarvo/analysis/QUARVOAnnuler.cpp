@@ -6,29 +6,18 @@
 #include "host/session/Session.h"
 #include "host/ui/Ecran.h"
 #include "quarvo/frame/Appels.h"
+#include "quarvo/frame/PieceKinds.h"
 
 namespace quarvo {
 
 using namespace host;
 using frame::appeler;
 
-// What differs between orders, goods-received notes and invoices.
-struct QUARVOAnnuler::Sorte {
-  const char* lettre;
-  const char* entete;
-  const char* lignes;
-  const char* titre;
-  const char* libelle;
-};
-
 namespace {
 
-const QUARVOAnnuler::Sorte kCommandes{"C", "GAPECOM", "GAPLCOM", "Traitement de la table GAPECOM",
-                                      "No commande : "};
-const QUARVOAnnuler::Sorte kReceptions{"B", "GAPEBL", "GAPLBL", "Traitement de la table GAPEBL",
-                                       "No bon de réception : "};
-const QUARVOAnnuler::Sorte kFactures{"F", "GAPEFAC", "GAPLFAC", "Traitement de la table GAPEFAC",
-                                     "No facture : "};
+const frame::SorteSelection& kCommandes = frame::kCommandesSelection;
+const frame::SorteSelection& kReceptions = frame::kReceptionsSelection;
+const frame::SorteSelection& kFactures = frame::kFacturesSelection;
 
 const char* const kBornes[] = {"BORNE1", "BORNE2", "BORNE3", "BORNE4",
                                "BORNE5", "BORNE6", "BORNE7"};

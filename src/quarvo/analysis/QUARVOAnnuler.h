@@ -29,6 +29,7 @@
 
 #include "host/automate/Seletat.h"
 #include "host/table/Champ.h"
+#include "quarvo/frame/PieceKinds.h"
 
 namespace quarvo {
 
@@ -69,7 +70,7 @@ class QUARVOAnnuler : public host::Seletat {
   // The close box leaves as "ABAND" does, through the screen exit.
   void fermer() override;
 
-  struct Sorte;  // one kind of piece: its tables and captions
+  using Sorte = frame::SorteSelection;  // one kind of piece: its tables and captions
 
  private:
   void listerPieces(host::Evt* evt, const Sorte& sorte);

@@ -25,6 +25,24 @@ inline constexpr std::array<PieceKind, 5> kPieceKinds{{
     {"", "AFEFFO", "AFLFFO", "AFEFFO", 0, "P3"},
 }};
 
+// What differs between the kinds a selection walks (orders, goods-received notes, invoices):
+// the letter that selects them, their tables, the waiting box's title and the caption of a piece
+// in it. The pointing and the cancellation selection walk the same three.
+struct SorteSelection {
+  const char* lettre;   // "C", "B", "F"
+  const char* entete;   // "GAPECOM"
+  const char* lignes;   // "GAPLCOM"
+  const char* titre;    // "Traitement de la table GAPECOM"
+  const char* libelle;  // "No commande : "
+};
+
+inline constexpr SorteSelection kCommandesSelection{
+    "C", "GAPECOM", "GAPLCOM", "Traitement de la table GAPECOM", "No commande : "};
+inline constexpr SorteSelection kReceptionsSelection{
+    "B", "GAPEBL", "GAPLBL", "Traitement de la table GAPEBL", "No bon de réception : "};
+inline constexpr SorteSelection kFacturesSelection{
+    "F", "GAPEFAC", "GAPLFAC", "Traitement de la table GAPEFAC", "No facture : "};
+
 // The kind whose header table or component is `name`; null when none.
 const PieceKind* kindOfTable(std::string_view name);
 const PieceKind* kindOfTypeCode(int typeCode);

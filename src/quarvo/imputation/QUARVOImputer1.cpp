@@ -174,13 +174,7 @@ void QUARVOImputer1::validation(Evt* evt) {
 
 void QUARVOImputer1::validation_piece(Evt*) {
   int64_t erreur = 0;
-  Table lignes(this, "VOVOVA", "M_LAPPR", "VALIDATION_PIECE");
-  lignes.effacerCriteres();
-  lignes.ajouterCritere("NUMERO", '/', Valeur::chaine(pIdent_.text() + "|"));
-  lignes.ouvrir();
-  while (lignes.lire(1) == 0) {
-    std::string cle =
-        lignes.valeur("COMPOSANT").toChaine() + "|" + lignes.valeur("COMPOSANT_IDENT").toChaine();
+  pourChaqueLigne([this, &erreur](Table& lignes, const std::string& cle) {
     double somme = 0;
     vappr2_.effacerCriteres();
     vappr2_.ajouterCritere("IDENT", '=', Valeur::chaine(cle));
@@ -194,7 +188,7 @@ void QUARVOImputer1::validation_piece(Evt*) {
     lignes.ecrire("ERREUR", Valeur::entier(juste ? 0 : 1));
     lignes.modifier();
     if (!juste) erreur = 1;
-  }
+  });
   entete().ecrire("ERREUR", Valeur::entier(erreur));
   if (erreur != 0) {
     // As the message says: a piece left unbalanced is not imputed.
@@ -204,14 +198,20 @@ void QUARVOImputer1::validation_piece(Evt*) {
   afficherListe("LSTV");
 }
 
-void QUARVOImputer1::abandon_piece(Evt*) {
-  Table lignes(this, "VOVOVA", "M_LAPPR", "ABANDON_PIECE");
+void QUARVOImputer1::pourChaqueLigne(
+    const std::function<void(Table& ligne, const std::string& cle)>& faire) {
+  Table lignes(this, "VOVOVA", "M_LAPPR", "LIGNES_PIECE");
   lignes.effacerCriteres();
   lignes.ajouterCritere("NUMERO", '/', Valeur::chaine(pIdent_.text() + "|"));
   lignes.ouvrir();
   while (lignes.lire(1) == 0) {
-    std::string cle =
-        lignes.valeur("COMPOSANT").toChaine() + "|" + lignes.valeur("COMPOSANT_IDENT").toChaine();
+    faire(lignes, lignes.valeur("COMPOSANT").toChaine() + "|" +
+                      lignes.valeur("COMPOSANT_IDENT").toChaine());
+  }
+}
+
+void QUARVOImputer1::abandon_piece(Evt*) {
+  pourChaqueLigne([this](Table& lignes, const std::string& cle) {
     Monnaie puht = toMonnaie(lignes.valeur("PUHT"));
     double qteLigne = toDouble(lignes.valeur("QTE"));
     double qttLigne = toDouble(lignes.valeur("QTT"));
@@ -227,7 +227,7 @@ void QUARVOImputer1::abandon_piece(Evt*) {
       vappr2_.ecrire("QTT", Valeur::dbl(qteLigne != 0 ? qttLigne / qteLigne * qte0 : 0.0));
       vappr2_.modifier();
     }
-  }
+  });
   if (ecran().trouverListe("LSTV") != nullptr) afficherListe("LSTV");
 }
 

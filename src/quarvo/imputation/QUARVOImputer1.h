@@ -13,6 +13,9 @@
 // Created with the piece's "M_EAPPR" identifier, by value.
 #pragma once
 
+#include <functional>
+#include <string>
+
 #include "host/automate/Gestion_document.h"
 #include "host/table/Table.h"
 
@@ -40,6 +43,9 @@ class QUARVOImputer1 : public host::Gestion_document {
   // The allocations' key of the current line ("GAPLCOM|<line IDENT>").
   std::string cleAllocations();
   int executer(const std::string& label);
+  // Each line of the piece, current on `ligne`, with its allocations' key.
+  void pourChaqueLigne(
+      const std::function<void(host::Table& ligne, const std::string& cle)>& faire);
 
   host::Field& pIdent_;
   host::Field& vDesig_;

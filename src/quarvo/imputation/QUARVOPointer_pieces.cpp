@@ -5,29 +5,18 @@
 #include "host/table/Database.h"
 #include "quarvo/frame/Appels.h"
 #include "quarvo/frame/Apports.h"
+#include "quarvo/frame/PieceKinds.h"
 
 namespace quarvo {
 
 using namespace host;
 using frame::appeler;
 
-// What differs between orders, goods-received notes and invoices.
-struct QUARVOPointer_pieces::Sorte {
-  const char* lettre;
-  const char* entete;
-  const char* lignes;
-  const char* titre;
-  const char* libelle;
-};
-
 namespace {
 
-const QUARVOPointer_pieces::Sorte kCommandes{"C", "GAPECOM", "GAPLCOM",
-                                             "Traitement de la table GAPECOM", "No commande : "};
-const QUARVOPointer_pieces::Sorte kReceptions{
-    "B", "GAPEBL", "GAPLBL", "Traitement de la table GAPEBL", "No bon de réception : "};
-const QUARVOPointer_pieces::Sorte kFactures{"F", "GAPEFAC", "GAPLFAC",
-                                            "Traitement de la table GAPEFAC", "No facture : "};
+const frame::SorteSelection& kCommandes = frame::kCommandesSelection;
+const frame::SorteSelection& kReceptions = frame::kReceptionsSelection;
+const frame::SorteSelection& kFactures = frame::kFacturesSelection;
 
 }  // namespace
 

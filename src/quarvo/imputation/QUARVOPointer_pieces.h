@@ -18,6 +18,7 @@
 
 #include "host/automate/Traitmnt.h"
 #include "host/table/Champ.h"
+#include "quarvo/frame/PieceKinds.h"
 
 namespace quarvo {
 
@@ -39,7 +40,7 @@ class QUARVOPointer_pieces : public host::Traitmnt {
   void creer_vappr(host::Evt* evt);
   void creer_aflbud(host::Evt* evt);
 
-  struct Sorte;  // one kind of piece: its tables and captions
+  using Sorte = frame::SorteSelection;  // one kind of piece: its tables and captions
 
  private:
   void pointerPieces(host::Evt* evt, const Sorte& sorte);

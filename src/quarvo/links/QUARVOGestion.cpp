@@ -647,12 +647,7 @@ void QUARVOGestion::piece_controler(Evt* evt) {
     erreurMethode(1, evt);
     return;
   }
-  Date date = toDate(lu(record, "DATE_CREATION"));
-  if (!vfinmo_.date().empty() && !date.empty() && date > vfinmo_.date()) {
-    message("89");
-    erreurMethode(1, evt);
-    return;
-  }
+  if (apresLeMois(toDate(lu(record, "DATE_CREATION")), evt)) return;
   verreur_.set(int64_t{0});
   appeler(*this, "QUARVO", "ANALYSER",
           {vcompo_.value(), lu(record, "IDENT"), val("0"), val(""), ref(verreur_)});
@@ -660,18 +655,7 @@ void QUARVOGestion::piece_controler(Evt* evt) {
     erreurMethode(1, evt);
     return;
   }
-  std::string cle = frame::cleCompo(pident2_.text(), vcompo_.text(), colonne("PIECE").toChaine());
-  std::string courant =
-      ligne().courantId() != 0 && mode() != 'C' ? colonne("IDENT").toChaine() : std::string();
-  memoire_.effacerCriteres();
-  memoire_.ajouterCritere("CLE_COMPO", '=', Valeur::chaine(cle));
-  memoire_.ouvrir();
-  while (memoire_.lire(1) == 0) {
-    if (memoire_.valeur("IDENT").toChaine() == courant) continue;  // the line itself
-    message("88");
-    erreurMethode(1, evt);
-    return;
-  }
+  if (dejaSurLaLigne(vcompo_.text(), evt)) return;
   erreurMethode(0, evt);
 }
 
@@ -806,25 +790,32 @@ void QUARVOGestion::afeffo_choisir(Evt*) {
 }
 
 void QUARVOGestion::afeffo_controler(Evt* evt) {
-  std::string cle = frame::cleCompo(pident2_.text(), "AFEFFO", colonne("PIECE").toChaine());
+  if (dejaSurLaLigne("AFEFFO", evt)) return;
+  if (apresLeMois(toDate(lu("I_AFEFFO", "DATE_PIECE")), evt)) return;
+  erreurMethode(0, evt);
+}
+
+bool QUARVOGestion::dejaSurLaLigne(const std::string& composant, Evt* evt) {
+  std::string cle = frame::cleCompo(pident2_.text(), composant, colonne("PIECE").toChaine());
   std::string courant =
       ligne().courantId() != 0 && mode() != 'C' ? colonne("IDENT").toChaine() : std::string();
   memoire_.effacerCriteres();
   memoire_.ajouterCritere("CLE_COMPO", '=', Valeur::chaine(cle));
   memoire_.ouvrir();
   while (memoire_.lire(1) == 0) {
-    if (memoire_.valeur("IDENT").toChaine() == courant) continue;
+    if (memoire_.valeur("IDENT").toChaine() == courant) continue;  // the line itself
     message("88");
     erreurMethode(1, evt);
-    return;
+    return true;
   }
-  Date date = toDate(lu("I_AFEFFO", "DATE_PIECE"));
-  if (!vfinmo_.date().empty() && !date.empty() && date > vfinmo_.date()) {
-    message("89");
-    erreurMethode(1, evt);
-    return;
-  }
-  erreurMethode(0, evt);
+  return false;
+}
+
+bool QUARVOGestion::apresLeMois(const Date& date, Evt* evt) {
+  if (vfinmo_.date().empty() || date.empty() || !(date > vfinmo_.date())) return false;
+  message("89");
+  erreurMethode(1, evt);
+  return true;
 }
 
 void QUARVOGestion::afeffo_calculer(Evt* evt) {

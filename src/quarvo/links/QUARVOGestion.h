@@ -96,6 +96,11 @@ class QUARVOGestion : public host::Gestion_doc {
   // Fills the current line from the piece read in its interface record and the computation.
   void remplirLigne(const std::string& composant, const std::string& record);
   void viderLigne();
+  // The checks every kind of piece passes; each shows its message and fails the event.
+  // A row of the document other than the current line already holds the piece typed (88).
+  bool dejaSurLaLigne(const std::string& composant, host::Evt* evt);
+  // The piece is dated after the company's current month (89).
+  bool apresLeMois(const host::Date& date, host::Evt* evt);
   // Reads the line's piece again and brings the line in step with it (after the piece was
   // consulted or settled); the line is then validated.
   void suivrePiece();

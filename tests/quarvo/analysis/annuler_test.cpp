@@ -10,6 +10,7 @@
 #include "host/event/Evt.h"
 #include "host/table/Table.h"
 #include "host/ui/ModeleEcran.h"
+#include "support/Audit.h"
 #include "support/Ecrans.h"
 #include "support/TestSession.h"
 
@@ -72,12 +73,7 @@ class AnnulerTest : public ::testing::Test {
     return t.compter();
   }
   std::string engage(const std::string& line) { return t_.value("AFLBUD", "VENG", "IDENT", line); }
-  bool propre() {
-    std::ostringstream out;
-    bool clean = app::runCheck(t_.session(), std::nullopt, false, out) == 0;
-    if (!clean) ADD_FAILURE() << out.str();
-    return clean;
-  }
+  ::testing::AssertionResult propre() { return test::sansEcart(t_.session()); }
 
   test::TestSession t_{true};
   std::unique_ptr<ModeleEcran> m_;

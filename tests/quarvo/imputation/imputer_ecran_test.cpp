@@ -9,6 +9,7 @@
 #include "app/FiguresCommand.h"
 #include "host/table/Table.h"
 #include "host/ui/ModeleEcran.h"
+#include "support/Audit.h"
 #include "support/Ecrans.h"
 #include "support/TestSession.h"
 
@@ -70,12 +71,7 @@ class ImputerEcranTest : public ::testing::Test {
     }
     return out;
   }
-  bool propre() {
-    std::ostringstream out;
-    bool clean = app::runCheck(t_.session(), std::nullopt, false, out) == 0;
-    if (!clean) ADD_FAILURE() << out.str();
-    return clean;
-  }
+  ::testing::AssertionResult propre() { return test::sansEcart(t_.session()); }
 
   test::TestSession t_{true};
   std::unique_ptr<ModeleEcran> m_;

@@ -10,6 +10,7 @@
 #include "host/automate/Registry.h"
 #include "host/table/Table.h"
 #include "host/ui/ModeleEcran.h"
+#include "support/Audit.h"
 #include "support/Ecrans.h"
 #include "support/TestSession.h"
 
@@ -53,13 +54,7 @@ class GestionTest : public ::testing::Test {
     return out + "engagé " + t_.value("AFLBUD", "VENG", "IDENT", line) + ", réalisé " +
            t_.value("AFLBUD", "VREA", "IDENT", line);
   }
-  // The audit of every budget line against its links finds nothing.
-  bool propre() {
-    std::ostringstream out;
-    bool clean = app::runCheck(t_.session(), std::nullopt, false, out) == 0;
-    if (!clean) ADD_FAILURE() << out.str();
-    return clean;
-  }
+  ::testing::AssertionResult propre() { return test::sansEcart(t_.session()); }
 
   test::TestSession t_{true};
   std::unique_ptr<ModeleEcran> m_;
