@@ -338,13 +338,7 @@ void QUARVOAnnuler::lst_selection(Evt* evt) {
   std::string composant = vEComposant_.text();
   std::string piece = ePiece_.text();
   appeler(*this, composant, "LECTURE", {eComposantIdent_.valeur()});
-  if (composant == "GAPECOM") {
-    vPiece_.set("BC " + piece);
-  } else if (composant == "GAPEBL") {
-    vPiece_.set("BR " + piece);
-  } else {
-    vPiece_.set((factureType_.text() == "F" ? "F " : "A ") + piece);
-  }
+  vPiece_.set(frame::legendePiece(composant, piece, factureType_.text()));
   if (auto fournisseur = Execute::execute(*this, "I_" + composant + ".GCPFOUR_IDENT")) {
     appeler(*this, "GCPFOUR", "LECTURE", {*fournisseur});
   }

@@ -16,4 +16,11 @@ const PieceKind* kindOfTypeCode(int typeCode) {
   return nullptr;
 }
 
+std::string legendePiece(std::string_view composant, const std::string& numero,
+                         std::string_view typeFacture) {
+  if (composant == "GAPECOM") return "BC " + numero;
+  if (composant == "GAPEBL") return "BR " + numero;
+  return (typeFacture == "F" ? "F " : "A ") + numero;
+}
+
 }  // namespace quarvo::frame

@@ -4,6 +4,7 @@
 #pragma once
 
 #include <array>
+#include <string>
 #include <string_view>
 
 namespace quarvo::frame {
@@ -42,6 +43,11 @@ inline constexpr SorteSelection kReceptionsSelection{
     "B", "GAPEBL", "GAPLBL", "Traitement de la table GAPEBL", "No bon de réception : "};
 inline constexpr SorteSelection kFacturesSelection{
     "F", "GAPEFAC", "GAPLFAC", "Traitement de la table GAPEFAC", "No facture : "};
+
+// The caption of a piece in a selection's list: "BC " + number for an order, "BR " for a
+// goods-received note, "F " for an invoice whose "TYPE" is "F" and "A " for any other invoice.
+std::string legendePiece(std::string_view composant, const std::string& numero,
+                         std::string_view typeFacture);
 
 // The kind whose header table or component is `name`; null when none.
 const PieceKind* kindOfTable(std::string_view name);

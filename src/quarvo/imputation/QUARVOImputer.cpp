@@ -4,6 +4,7 @@
 #include "host/session/Session.h"
 #include "host/ui/Ecran.h"
 #include "quarvo/frame/Appels.h"
+#include "quarvo/frame/PieceKinds.h"
 
 namespace quarvo {
 
@@ -215,12 +216,8 @@ void QUARVOImputer::lst_selection(Evt*) {
   std::string composant = vEComposant_.text();
   std::string piece = eappr_.valeur("PIECE").toChaine();
   if (appeler(*this, composant, "LECTURE", {eappr_.valeur("COMPOSANT_IDENT")}) != 0) return;
-  if (composant == "GAPECOM") vpiece_.set("BC " + piece);
-  if (composant == "GAPEBL") vpiece_.set("BR " + piece);
-  if (composant == "GAPEFAC") {
-    bool facture = Execute::execute(*this, "I_GAPEFAC.TYPE").value_or(Valeur()).toChaine() == "F";
-    vpiece_.set((facture ? "F " : "A ") + piece);
-  }
+  std::string type = Execute::execute(*this, "I_GAPEFAC.TYPE").value_or(Valeur()).toChaine();
+  vpiece_.set(frame::legendePiece(composant, piece, type));
   appeler(*this, "GCPFOUR", "LECTURE",
           {Execute::execute(*this, "I_" + composant + ".GCPFOUR_IDENT").value_or(Valeur())});
 }
