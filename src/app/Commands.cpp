@@ -304,7 +304,7 @@ Commande reportCommand(CLI::App& cli) {
   struct Saisie {
     ReportOptions options;
     std::string pdf;
-    std::string exportFile;
+    std::vector<std::string> exports;
     bool noBefore = false;
     CLI::Option* print = nullptr;
     CLI::Option* exporter = nullptr;
@@ -325,14 +325,22 @@ Commande reportCommand(CLI::App& cli) {
   app->add_flag("--no-before", s->noBefore, "Leave out pieces dated before the period");
   s->print = app->add_option("--print", s->pdf, "PDF file (default: under the database folder)")
                  ->expected(0, 1);
-  s->exporter = app->add_option("--export", s->exportFile,
-                                "Export file; .xlsx gives a workbook (default: the saved one)")
-                    ->expected(0, 1);
+  s->exporter =
+      app->add_option("--export", s->exports,
+                      "Export file; .xlsx gives a workbook (default: the saved one); may be "
+                      "repeated, one selection giving each file")
+          ->expected(0, 1)
+          ->multi_option_policy(CLI::MultiOptionPolicy::TakeAll)
+          ->default_str("");
   return {app, Commande::Base::Ouverte, true, [s](Contexte& c) {
             ReportOptions options = s->options;
             options.beforePeriod = !s->noBefore;
             if (*s->print) options.print = s->pdf;
-            if (*s->exporter) options.exportFile = s->exportFile;
+            if (*s->exporter) {
+              // "--export" without a file asks for the screen's saved one.
+              options.exports = s->exports;
+              if (options.exports.empty()) options.exports.push_back("");
+            }
             return runReport(*c.session, options, c.out);
           }};
 }

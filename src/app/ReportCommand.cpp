@@ -104,8 +104,9 @@ int runReport(Session& session, const ReportOptions& o, std::ostream& out, Repor
 
   ReportPaths done;
   int rc = 0;
-  if (o.exportFile) {
-    if (!o.exportFile->empty()) poser("VFICHIER", *o.exportFile);
+  for (const auto& exportFile : o.exports) {
+    if (rc != 0) break;
+    if (!exportFile.empty()) poser("VFICHIER", exportFile);
     fs::path file = screen.valeur("VFICHIER");
     std::error_code ec;
     fs::remove(file, ec);
@@ -113,11 +114,11 @@ int runReport(Session& session, const ReportOptions& o, std::ostream& out, Repor
     if (!screen.presser("VALID") || !ecrit(file)) {
       rc = 1;
     } else {
-      done.exported = file;
+      if (done.exported.empty()) done.exported = file;
       out << "report exported to " << file.string() << "\n";
     }
   }
-  if (rc == 0 && (o.print || !o.exportFile)) {
+  if (rc == 0 && (o.print || o.exports.empty())) {
     fs::path pdf = o.print && !o.print->empty() ? fs::path(*o.print)
                                                 : Edition_etat::destination(session, "IMPETAT1");
     Edition_etat::Destination destination(session, pdf);
@@ -150,7 +151,7 @@ ReportPaths reportDemo(Session& session, const fs::path& dir) {
   o.criterion = "AFCLIE";
   o.options = "11111";
   o.print = (dir / "suivi_achats.pdf").string();
-  o.exportFile = (dir / "suivi_achats.xlsx").string();
+  o.exports = {(dir / "suivi_achats.xlsx").string()};
   std::ostringstream quiet;
   ReportPaths paths;
   runReport(session, o, quiet, &paths);

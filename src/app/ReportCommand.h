@@ -9,6 +9,7 @@
 #include <iosfwd>
 #include <optional>
 #include <string>
+#include <vector>
 
 #include "host/session/Session.h"
 
@@ -23,9 +24,10 @@ struct ReportOptions {
   std::string options;    // five 0/1 characters: page per project, lines, pieces, recap 1, recap 2
   std::string states;     // budget states T, A, NC, NA or C; ":O" keeps closed budgets of the
                           // year (NC, NA) or only those (C)
-  bool beforePeriod = true;               // gather the pieces before the period
-  std::optional<std::string> print;       // PDF file; "" the default place
-  std::optional<std::string> exportFile;  // export file (.xlsx for a workbook); "" the screen's
+  bool beforePeriod = true;          // gather the pieces before the period
+  std::optional<std::string> print;  // PDF file; "" the default place
+  // Export files (.xlsx for a workbook), in order; "" the screen's saved one.
+  std::vector<std::string> exports;
 };
 
 struct ReportPaths {
@@ -35,7 +37,7 @@ struct ReportPaths {
 
 // Runs the report; prints where the files went on `out`. Returns 0, or 1 when the screen
 // refused the selection or a file was not written. Throws UsageError for a bad option.
-// With neither `print` nor `exportFile`, prints to the default place.
+// With neither `print` nor `exports`, prints to the default place.
 int runReport(host::Session& session, const ReportOptions& options, std::ostream& out,
               ReportPaths* paths = nullptr);
 

@@ -21,14 +21,16 @@ TEST(ReportCommandTest, PrintsAndExportsTheSelectionGivenOnTheCommandLine) {
   o.budget = "0000000202";
   o.options = "11100";
   o.print = (f.t().dir() / "out" / "suivi.pdf").string();
-  o.exportFile = (f.t().dir() / "out" / "suivi.txt").string();
+  o.exports = {(f.t().dir() / "out" / "suivi.txt").string(),
+               (f.t().dir() / "out" / "suivi.xlsx").string()};
   std::ostringstream out;
   ReportPaths paths;
   ASSERT_EQ(app::runReport(f.t().session(), o, out, &paths), 0);
-  EXPECT_EQ(out.str(),
-            "report exported to " + *o.exportFile + "\nreport printed to " + *o.print + "\n");
+  EXPECT_EQ(out.str(), "report exported to " + o.exports[0] + "\nreport exported to " +
+                           o.exports[1] + "\nreport printed to " + *o.print + "\n");
+  EXPECT_TRUE(std::filesystem::exists(o.exports[1]));  // one command, each output
   EXPECT_EQ(paths.pdf, *o.print);
-  std::string exported = ReportFixture::lire(*o.exportFile);
+  std::string exported = ReportFixture::lire(o.exports[0]);
   EXPECT_NE(exported.find("AFF002\tRéseau d'eau potable — hameau de Sainte-Hélène\tMANUEL"),
             std::string::npos);
   EXPECT_EQ(exported.find("AFF001"), std::string::npos);  // only the chosen budget
@@ -57,9 +59,9 @@ TEST(ReportCommandTest, BadOptionsAndRefusals) {
   // The screen refuses a period past the fiscal year: nothing written, a failed run.
   ReportOptions late;
   late.to = "15/01/2027";
-  late.exportFile = (f.t().dir() / "late.txt").string();
+  late.exports = {(f.t().dir() / "late.txt").string()};
   EXPECT_EQ(app::runReport(f.t().session(), late, out), 1);
-  EXPECT_FALSE(std::filesystem::exists(*late.exportFile));
+  EXPECT_FALSE(std::filesystem::exists(late.exports[0]));
   EXPECT_NE(f.t().ui().transcriptText().find("[100]"), std::string::npos);
 }
 
