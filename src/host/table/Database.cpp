@@ -16,13 +16,14 @@ TransactionsGroupees::TransactionsGroupees(Database& db, int unites,
   groupe_.emplace(db_);
 }
 
-void TransactionsGroupees::uniteTerminee() {
+bool TransactionsGroupees::uniteTerminee() {
   if (!groupe_) throw UException("unit ended after its group was closed");
-  if (++ouvertes_ < unites_ && Clock::now() - debut_ < delai_) return;
+  if (++ouvertes_ < unites_ && Clock::now() - debut_ < delai_) return false;
   terminer();
   ouvertes_ = 0;
   debut_ = Clock::now();
   groupe_.emplace(db_);
+  return true;
 }
 
 void TransactionsGroupees::terminer() {

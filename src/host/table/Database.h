@@ -73,8 +73,9 @@ class TransactionsGroupees {
   TransactionsGroupees(const TransactionsGroupees&) = delete;
   TransactionsGroupees& operator=(const TransactionsGroupees&) = delete;
   // Called after a unit's own transaction committed or rolled back; may commit the group and
-  // open the next one. REQUIRES: terminer() has not run.
-  void uniteTerminee();
+  // open the next one: true when it did (every unit ended so far is then in the database).
+  // REQUIRES: terminer() has not run.
+  bool uniteTerminee();
   // Commits what the group holds and closes it. Idempotent.
   void terminer();
 

@@ -1,5 +1,7 @@
 #include "quarvo/imputation/QUARVOImputer_pieces.h"
 
+#include <vector>
+
 #include "host/session/Session.h"
 #include "host/table/Database.h"
 #include "quarvo/frame/Appels.h"
@@ -40,21 +42,45 @@ void QUARVOImputer_pieces::faire(Evt* evt) {
   eappr_.effacerCriteres();
   eappr_.ajouterCritere("IMPUTATION", '=', Valeur::chaine("O"));
   eappr_.ouvrir();
+  // Pieces are committed by groups, each piece a savepoint of its group: a piece is still
+  // written whole or not at all, and the pages every piece touches (budget lines, counters,
+  // indexes) are written once per group. What a piece's record says of it is written once its
+  // group is in the database, so that a run cut short never counts a piece it lost.
+  struct Ecrite {
+    RowId piece;
+    std::string resultat;
+    int64_t liens;
+    Monnaie ht;
+  };
+  std::vector<Ecrite> enAttente;
+  auto noter = [this, &enAttente] {
+    for (const auto& e : enAttente) {
+      eappr_.aller(e.piece);
+      eappr_.ecrire("ECRITURE", Valeur::chaine(e.resultat));
+      eappr_.ecrire("LIENS_CREES", Valeur::entier(e.liens));
+      eappr_.ecrire("HT_LIE", Valeur::monnaie(e.ht));
+      eappr_.modifier();
+    }
+    enAttente.clear();
+  };
+  TransactionsGroupees groupe(session().db());
   while (eappr_.lire(1) == 0) {
-    // A piece is written whole or not at all: a run cut short leaves no half-linked piece
-    // that the next pointing would take for an unchanged one. Its transaction is a write
-    // transaction from its start, so one writer at a time decides what the piece still needs.
     liensCrees_ = 0;
     htLie_ = Monnaie();
-    Transaction piece(session().db());
-    std::string resultat = ecrirePiece(evt);
-    piece.commit();
-    // What this run wrote, for its summary.
-    eappr_.ecrire("ECRITURE", Valeur::chaine(resultat));
-    eappr_.ecrire("LIENS_CREES", Valeur::entier(liensCrees_));
-    eappr_.ecrire("HT_LIE", Valeur::monnaie(htLie_));
-    eappr_.modifier();
+    RowId courante = eappr_.courantId();
+    {
+      // Its savepoint is a write transaction from the group's start, so one writer at a time
+      // decides what the piece still needs.
+      Transaction piece(session().db());
+      std::string resultat = ecrirePiece(evt);
+      piece.commit();
+      enAttente.push_back({courante, resultat, liensCrees_, htLie_});
+    }
+    eappr_.aller(courante);
+    if (groupe.uniteTerminee()) noter();
   }
+  groupe.terminer();
+  noter();
   erreurMethode(0, evt);
   sortir(nullptr, 0);
 }
