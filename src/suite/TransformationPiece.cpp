@@ -7,6 +7,7 @@
 #include "host/session/Session.h"
 #include "host/table/Database.h"
 #include "suite/TableInterface.h"
+#include "suite/Zumndoc.h"
 
 namespace quarvo::suite {
 
@@ -151,18 +152,9 @@ bool TransformationPiece::completerEntete(const SortePiece& cible, Table& source
 
 std::string TransformationPiece::numeroDocument(const SortePiece& cible) {
   std::string prefixe = cible.prefixe;
-  Table compteur(this, cible.base, "ZUMNDOC", "NUMERO_DOC");
-  compteur.effacerCriteres();
-  compteur.ajouterCritere("MODULE", '=', Valeur::chaine(cible.module));
-  compteur.ajouterCritere("NOM", '=', Valeur::chaine("NUMERO_DOC"));
-  compteur.ajouterCritere("BASE", '=', Valeur::chaine(cible.base));
-  int64_t suivant = 1;
-  if (compteur.lire(3) == 0) {
-    suivant = toEntier(compteur.valeur("DERNIER")) + 1;
-    compteur.ecrire("DERNIER", Valeur::entier(suivant));
-    if (compteur.modifier() != 0) return "";
-  } else {
+  int64_t suivant = avancerCompteur(*this, cible.base, cible.module, "NUMERO_DOC", [&] {
     // Above every number the kind already has, whatever its year.
+    int64_t premier = 1;
     Table pieces(this, cible.base, cible.module, "NUMERO_DOC");
     pieces.effacerCriteres();
     pieces.ajouterCritere("NUMERO_DOC", '/', Valeur::chaine(prefixe), 'R');
@@ -172,17 +164,13 @@ std::string TransformationPiece::numeroDocument(const SortePiece& cible) {
       int64_t n = 0;
       const char* debut = numero.data() + std::min(numero.size(), prefixe.size() + 2);
       auto [fin, ec] = std::from_chars(debut, numero.data() + numero.size(), n);
-      if (ec == std::errc() && fin == numero.data() + numero.size() && n >= suivant) {
-        suivant = n + 1;
+      if (ec == std::errc() && fin == numero.data() + numero.size() && n >= premier) {
+        premier = n + 1;
       }
     }
-    compteur.preparer();
-    compteur.ecrire("MODULE", Valeur::chaine(cible.module));
-    compteur.ecrire("NOM", Valeur::chaine("NUMERO_DOC"));
-    compteur.ecrire("BASE", Valeur::chaine(cible.base));
-    compteur.ecrire("DERNIER", Valeur::entier(suivant));
-    if (compteur.inserer() != 0) return "";
-  }
+    return premier;
+  });
+  if (suivant == 0) return "";
   char numero[32];
   std::snprintf(numero, sizeof numero, "%s%02d%06lld", prefixe.c_str(), Date::today().year() % 100,
                 static_cast<long long>(suivant));

@@ -19,6 +19,27 @@ bool isNumber(const std::string& s, int64_t& out) {
 }
 }  // namespace
 
+int64_t avancerCompteur(Automate& caller, const std::string& base, const std::string& module,
+                        const std::string& nom, const std::function<int64_t()>& premier) {
+  Table counter(&caller, base, "ZUMNDOC", "COMPTEUR_" + nom);
+  counter.effacerCriteres();
+  counter.ajouterCritere("MODULE", '=', Valeur::chaine(module));
+  counter.ajouterCritere("NOM", '=', Valeur::chaine(nom));
+  counter.ajouterCritere("BASE", '=', Valeur::chaine(base));
+  if (counter.lire(3) == 0) {
+    int64_t next = toEntier(counter.valeur("DERNIER")) + 1;
+    counter.ecrire("DERNIER", Valeur::entier(next));
+    return counter.modifier() == 0 ? next : 0;
+  }
+  int64_t next = premier();
+  counter.preparer();
+  counter.ecrire("MODULE", Valeur::chaine(module));
+  counter.ecrire("NOM", Valeur::chaine(nom));
+  counter.ecrire("BASE", Valeur::chaine(base));
+  counter.ecrire("DERNIER", Valeur::entier(next));
+  return counter.inserer() == 0 ? next : 0;
+}
+
 Zumndoc::Zumndoc(Evt* evt) : Interface2(evt) {
   addBranch("ATTRIBUE_NUMERO", [this](Evt* e) { attribuer(e); });
   addBranch("VALIDE_NUMERO", [this](Evt* e) { valider(e); });
@@ -52,32 +73,22 @@ void Zumndoc::attribuer(Evt* evt) {
   // is already held and the single write below is atomic: no savepoint of its own is needed.
   std::optional<Transaction> tx;
   if (session().db().depth() == 0) tx.emplace(session().db());
-  Table counter(this, r.base, "ZUMNDOC", "COMPTEUR");
-  counter.effacerCriteres();
-  counter.ajouterCritere("MODULE", '=', Valeur::chaine(r.table));
-  counter.ajouterCritere("NOM", '=', Valeur::chaine("NUMEROS"));
-  counter.ajouterCritere("BASE", '=', Valeur::chaine(r.base));
-  int64_t next = 1;
-  if (counter.lire(3) == 0) {
-    next = toEntier(counter.valeur("DERNIER")) + 1;
-    counter.ecrire("DERNIER", Valeur::entier(next));
-    counter.modifier();
-  } else {
+  int64_t next = avancerCompteur(*this, r.base, r.table, "NUMEROS", [this, &r] {
     // Start above what the table already holds, so no identifier is ever given twice.
+    int64_t premier = 1;
     Table numbered(this, r.base, r.table, "NUMEROTE");
     if (numbered.store().schema().index("IDENT")) {
       numbered.ouvrir();
       while (numbered.lire(1) == 0) {
         int64_t n = 0;
-        if (isNumber(numbered.valeur("IDENT").toChaine(), n) && n >= next) next = n + 1;
+        if (isNumber(numbered.valeur("IDENT").toChaine(), n) && n >= premier) premier = n + 1;
       }
     }
-    counter.preparer();
-    counter.ecrire("MODULE", Valeur::chaine(r.table));
-    counter.ecrire("NOM", Valeur::chaine("NUMEROS"));
-    counter.ecrire("BASE", Valeur::chaine(r.base));
-    counter.ecrire("DERNIER", Valeur::entier(next));
-    counter.inserer();
+    return premier;
+  });
+  if (next == 0) {
+    erreurMethode(1, evt);
+    return;
   }
   if (tx) tx->commit();
   ident.set(identifiant(next, r.width));

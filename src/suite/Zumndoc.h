@@ -11,9 +11,21 @@
 // confirms a number: it fails when the number was never given out.
 #pragma once
 
+#include <cstdint>
+#include <functional>
+#include <string>
+
 #include "host/automate/Interface2.h"
 
 namespace quarvo::suite {
+
+// Advances a numbering counter, the "ZUMNDOC" row of `base`, `module` and `nom`, and gives its
+// new value. A counter that does not exist yet is created at `premier()` (the caller's rule for
+// starting above what its table already holds). 0 when the counter cannot be written.
+// REQUIRES: the caller holds the write lock (a transaction is open), so no two callers get the
+// same value.
+int64_t avancerCompteur(host::Automate& caller, const std::string& base, const std::string& module,
+                        const std::string& nom, const std::function<int64_t()>& premier);
 
 class Zumndoc : public host::Interface2 {
  public:

@@ -9,6 +9,7 @@
 #include "app/FiguresCommand.h"
 #include "app/Workspace.h"
 #include "host/table/Table.h"
+#include "support/Audit.h"
 #include "support/TestSession.h"
 
 namespace quarvo {
@@ -21,11 +22,7 @@ using host::Valeur;
 class CancelCommandTest : public ::testing::Test {
  protected:
   void SetUp() override {
-    // Order CF26000001 is then linked to two budget lines: 211 (720.00) and 212 (630.00).
-    t_.sql(R"(UPDATE "GAPLCOM" SET "GCPARTIC_IDENT" = '0000000084', "GCPARTIC_CODE" = 'ROBINET-EQ'
-              WHERE "NUMERO" = '0000000401|2')");
-    ASSERT_EQ(t_.session().appelerModule("QUARVO-IMPUTER_AUTO", nullptr), 0);
-    t_.session().executerEnAttente();
+    ASSERT_NO_FATAL_FAILURE(test::imputerUneCommandeSurDeuxLignes(t_));
     ASSERT_EQ(liens(), 11);
   }
   int64_t liens(const std::string& piece = {}) {

@@ -24,12 +24,7 @@ using host::Valeur;
 class AnnulerTest : public ::testing::Test {
  protected:
   void SetUp() override {
-    // The switchboards of order CF26000001 become plumbing: the order is then linked to the
-    // electrical line 211 (720.00) and to the plumbing line 212 (630.00).
-    t_.sql(R"(UPDATE "GAPLCOM" SET "GCPARTIC_IDENT" = '0000000084', "GCPARTIC_CODE" = 'ROBINET-EQ'
-              WHERE "NUMERO" = '0000000401|2')");
-    ASSERT_EQ(t_.session().appelerModule("QUARVO-IMPUTER_AUTO", nullptr), 0);
-    t_.session().executerEnAttente();
+    ASSERT_NO_FATAL_FAILURE(test::imputerUneCommandeSurDeuxLignes(t_));
     ASSERT_EQ(liens("CF26000001"), "0000000211 720.00, 0000000212 630.00");
   }
   void ouvrir() {
