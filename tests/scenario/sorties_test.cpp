@@ -49,12 +49,12 @@ TEST(SortiesTest, TheDemoReportIsUnchanged) {
       << test::lire(t.dir() / "demo.log");
   fs::path out = t.dir() / "out";
   fs::create_directories(out);
-  ASSERT_EQ(test::executer(db,
-                           {"report", "--from", "01/01/2026", "--to", "31/12/2026", "--criterion",
-                            "AFCLIE", "--options", "11111", "--print", (out / "suivi.pdf").string(),
-                            "--export", (out / "suivi.txt").string(), "--export",
-                            (out / "suivi.xlsx").string()},
-                           t.dir() / "report.log"),
+  ASSERT_EQ(test::executer(
+                db,
+                {"report", "--from", "01/01/2026", "--to", "31/12/2026", "--criterion", "AFCLIE",
+                 "--options", "11111", "--print", (out / "suivi.pdf").string(), "--export",
+                 (out / "suivi.txt").string(), "--export", (out / "suivi.xlsx").string()},
+                t.dir() / "report.log"),
             0)
       << test::lire(t.dir() / "report.log");
 
