@@ -4,10 +4,12 @@
 
 #include <chrono>
 #include <filesystem>
+#include <optional>
 #include <thread>
 
 #include "host/UException.h"
 #include "host/table/Table.h"
+#include "support/Programme.h"
 #include "support/TestSession.h"
 
 namespace quarvo::host {
@@ -84,6 +86,43 @@ TEST_F(SqliteReadsTest, ReadsInATransactionFollowOwnWritesRollbacksAndOtherConne
   EXPECT_EQ(parNom("c"), "02:5;");  // outside a transaction too
 }
 
+// A whole small table read without criteria (settings, purchase accounts) is remembered like
+// any selection: it must follow every row added, changed or removed, and another program's.
+TEST_F(SqliteReadsTest, AWholeTableReadWithoutCriteriaFollowsEveryWrite) {
+  auto tout = [] {
+    Table c(nullptr, "VOVOVA", "T_TEST", "TOUT");
+    c.effacerCriteres();
+    c.ouvrir();
+    std::string out;
+    while (c.lire(1) == 0)
+      out += c.valeur("IDENT").toChaine() + ":" + c.valeur("N").toChaine() + ";";
+    return out;
+  };
+  Table w(nullptr, "VOVOVA", "T_TEST", "ECRITURE");
+  {
+    Transaction tx(t_.db());
+    EXPECT_EQ(tout(), "01:1;02:2;");
+    w.preparer();
+    w.ecrire("IDENT", Valeur::chaine("03"));
+    ASSERT_EQ(w.inserer(), 0);
+    EXPECT_EQ(tout(), "01:1;02:2;03:0;");
+    ASSERT_EQ(w.chercher(3, "IDENT", '=', Valeur::chaine("01")), 0);
+    w.ecrire("N", Valeur::entier(7));
+    ASSERT_EQ(w.modifier(), 0);
+    EXPECT_EQ(tout(), "01:7;02:2;03:0;");
+    ASSERT_EQ(w.supprimer('N'), 0);
+    EXPECT_EQ(tout(), "02:2;03:0;");
+  }  // rolled back
+  {
+    Transaction tx(t_.db());
+    EXPECT_EQ(tout(), "01:1;02:2;");
+    tx.commit();
+  }
+  autre()->execScript(R"(INSERT INTO "T_TEST" ("IDENT", "N") VALUES ('04', 4))");
+  Transaction tx(t_.db());
+  EXPECT_EQ(tout(), "01:1;02:2;04:4;");
+}
+
 TEST_F(SqliteReadsTest, ColumnsKeptByATriggerAreReadAgainAfterTheUpdatesThatFireIt) {
   t_.sql(R"(CREATE TABLE "T_CLE" ("IDENT" TEXT PRIMARY KEY, "NOM" TEXT, "N" INTEGER DEFAULT 0,
                                    "CLE" TEXT);
@@ -121,6 +160,38 @@ TEST_F(SqliteReadsTest, AnUpdateWritesOnlyTheColumnsItChanged) {
   ASSERT_EQ(w.modifier(), 0);  // nothing changed since: nothing written
   EXPECT_EQ(t_.value("T_TEST", "M", "IDENT", "01"), "7.50");
   EXPECT_EQ(t_.value("T_TEST", "N", "IDENT", "01"), "3");
+}
+
+// A column written with the value it already holds is not written: its triggers do not fire
+// (a record copied back whole changes only what differs). A column the file holds no value for
+// is written even with its kind's default, and the next read sees the stored value, inside a
+// transaction as outside.
+TEST_F(SqliteReadsTest, AColumnRewrittenWithItsOwnValueIsNotWrittenButAMissingValueIs) {
+  t_.sql(R"(CREATE TABLE "T_JOURNAL" ("QUI" TEXT);
+            CREATE TRIGGER "TR_T_TEST_NOM" AFTER UPDATE OF "NOM" ON "T_TEST" BEGIN
+              INSERT INTO "T_JOURNAL" VALUES (NEW."IDENT");
+            END;
+            UPDATE "T_TEST" SET "M" = NULL WHERE "IDENT" = '02';)");
+  for (bool enTransaction : {false, true}) {
+    std::optional<Transaction> tx;
+    if (enTransaction) tx.emplace(t_.db());
+    Table w(nullptr, "VOVOVA", "T_TEST", "ECRITURE");
+    ASSERT_EQ(w.chercher(3, "IDENT", '=', Valeur::chaine("02")), 0);
+    w.ecrire("NOM", Valeur::chaine("b"));       // as it is
+    w.ecrire("M", Valeur::monnaie(Monnaie()));  // NULL in the file: 0.00 is a change
+    ASSERT_EQ(w.modifier(), 0);
+    ASSERT_EQ(w.chercher(3, "IDENT", '=', Valeur::chaine("02")), 0);
+    w.ecrire("NOM", Valeur::chaine("c"));
+    ASSERT_EQ(w.modifier(), 0);
+    w.ecrire("NOM", Valeur::chaine("b"));
+    ASSERT_EQ(w.modifier(), 0);
+    if (tx) tx->commit();
+  }
+  EXPECT_EQ(t_.value("T_TEST", "M", "IDENT", "02"), "0.00");
+  test::Lecture l(t_.dir() / "test.db");
+  EXPECT_EQ(l.lignes(R"(SELECT count(*) FROM "T_TEST" WHERE "M" IS NULL)").front(), "0");
+  // Two real changes of the name per pass: four rows, none for the name written as it was.
+  EXPECT_EQ(l.lignes(R"(SELECT count(*) FROM "T_JOURNAL")").front(), "4");
 }
 
 // A trigger may write other tables than its own, and fire their triggers in turn: whatever a

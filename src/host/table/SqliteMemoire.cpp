@@ -62,6 +62,7 @@ void MemoireTable::tenir(RowId id, Row& memoire, const std::vector<size_t>& ecri
   colonnes.resize(memoire.values.size(), false);
   for (size_t k = 0; k < ecrites.size(); ++k) {
     memoire.values[ecrites[k]] = std::move(valeurs[k]);
+    memoire.remplie(ecrites[k]);
     colonnes[ecrites[k]] = true;
   }
 }

@@ -91,15 +91,17 @@ void SqliteStore::ecrireEnAttente() {
 }
 
 std::vector<RowId> SqliteStore::select(const std::vector<Criterion>& criteria) {
-  std::string cle;
+  // A selection without criteria (a whole small table: the purchase accounts, the settings) is
+  // remembered like any other; its key is the empty one.
+  std::optional<std::string> cle;
   if (db_.memoireActive()) {
     cle = MemoireTable::cleSelection(criteria);
-    if (const auto* ids = memoire_.selection(cle)) return *ids;
+    if (const auto* ids = memoire_.selection(*cle)) return *ids;
   }
   std::vector<RowId> ids = lireSelection(criteria, order_);
-  if (!cle.empty() && ids.size() <= MemoireTable::kSelectionRetenue) {
+  if (cle && ids.size() <= MemoireTable::kSelectionRetenue) {
     if (memoire_.pleine()) oublier();
-    memoire_.retenir(description_.schema, criteria, cle, ids);
+    memoire_.retenir(description_.schema, criteria, *cle, ids);
   }
   return ids;
 }
@@ -172,7 +174,9 @@ bool SqliteStore::lireLigne(RowId id, Row& out) {
   if (rc != SQLITE_ROW) statements_.fail("read of " + name_);
   const auto& cols = description_.schema.columns();
   out.values.resize(cols.size());
+  out.nulles.assign(cols.size(), false);
   for (size_t i = 0; i < cols.size(); ++i) {
+    out.nulles[i] = sqlite3_column_type(st, static_cast<int>(i)) == SQLITE_NULL;
     if (!readColumn(st, static_cast<int>(i), cols[i].kind, out.values[i])) {
       // Written behind the runtime's back: reading it as "no value" would give a wrong
       // figure without a word.
@@ -240,7 +244,10 @@ void SqliteStore::update(RowId id, const Row& row, const std::vector<bool>& chan
   if (retenue != nullptr) avant.swap(*retenue);
   executerUpdate(id, row, ecrites);
   if (avant && !declenche) {
-    for (size_t i : ecrites) avant->values[i] = ajustee(row, i);
+    for (size_t i : ecrites) {
+      avant->values[i] = ajustee(row, i);
+      avant->remplie(i);
+    }
     retenue = memoire_.ligne(id);
     if (retenue != nullptr) *retenue = std::move(avant);
   }

@@ -50,8 +50,17 @@ class TableSchema {
 };
 
 // One row: values aligned with the schema's columns (missing trailing values read as defaults).
+// `nulles` flags the columns the store holds no value for (read as their kind's default): a
+// write of that default is still a change of what is stored.
 struct Row {
   std::vector<Valeur> values;
+  std::vector<bool> nulles;
+
+  bool nulle(size_t i) const { return i < nulles.size() && nulles[i]; }
+  // Column i now holds a value of its own.
+  void remplie(size_t i) {
+    if (i < nulles.size()) nulles[i] = false;
+  }
 };
 
 // A selection criterion: '=' equal, '+' from (>=), '-' up to (<=), '/' starts with.

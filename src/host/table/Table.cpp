@@ -115,6 +115,7 @@ void Table::preparer() {
   current_ = 0;
   const auto& cols = store().schema().columns();
   buffer_.values.clear();
+  buffer_.nulles.clear();
   for (const auto& c : cols) buffer_.values.push_back(defaultOf(c.kind));
   changees_.clear();
 }
@@ -201,8 +202,12 @@ bool Table::ecrire(std::string_view column, const Valeur& value) {
       row.values[k] = defaultOf(s.schema().columns()[k].kind);
     }
   }
-  row.values[*i] = std::move(*fitted);
-  if (!isRecord_) {
+  // Only a column whose stored value changes is written: the store then maintains only the
+  // indexes, and fires only the triggers, of what really changed.
+  Valeur& cible = row.values[*i];
+  bool change = row.nulle(*i) || cible.kind() != fitted->kind() || !(cible == *fitted);
+  cible = std::move(*fitted);
+  if (!isRecord_ && change) {
     if (changees_.size() <= *i) changees_.resize(s.schema().columns().size(), false);
     changees_[*i] = true;
   }
