@@ -9,6 +9,7 @@
 
 #include "app/Console.h"
 #include "app/Workspace.h"
+#include "host/UException.h"
 #include "host/automate/Automate.h"
 #include "host/table/Champ.h"
 #include "host/table/Database.h"
@@ -164,6 +165,45 @@ std::vector<TextRow> liensSansPiece() {
   return rows;
 }
 
+// A budget line's number is its budget's identifier, '|', its place in the budget: the database
+// derives the line's budget from the number when the number is written. A line whose budget
+// disagrees with its number was changed behind the module's back (its budget column written
+// alone): its figures would be reported under the wrong budget.
+struct BudgetEcarte {
+  std::string ligne;
+  std::string numero;
+  std::string budget;
+  std::string parNumero;
+};
+
+std::vector<BudgetEcarte> budgetsEcartes(const std::optional<std::string>& only) {
+  std::vector<BudgetEcarte> out;
+  Table t(nullptr, "VOVOVA", "AFLBUD", "BUDGET_PAR_NUMERO");
+  if (only) {
+    t.chercher(3, "IDENT", '=', Valeur::chaine(*only));
+  }
+  t.ouvrir();
+  while (t.lire(1) == 0) {
+    std::string numero = t.valeur("NUMERO").toChaine();
+    size_t barre = numero.find('|');
+    if (barre == std::string::npos || barre == 0) continue;
+    std::string budget = t.valeur("AFEBUD_IDENT").toChaine();
+    if (numero.compare(0, barre, budget) == 0 && budget.size() == barre) continue;
+    out.push_back({t.valeur("IDENT").toChaine(), numero, budget, numero.substr(0, barre)});
+  }
+  return out;
+}
+
+// Gives each line its budget by its number, as the database does when a number is written.
+void reparerBudgets(const std::vector<BudgetEcarte>& lignes) {
+  Table t(nullptr, "VOVOVA", "AFLBUD", "BUDGET_PAR_NUMERO");
+  for (const auto& l : lignes) {
+    if (t.chercher(3, "IDENT", '=', Valeur::chaine(l.ligne)) != 0) continue;
+    t.ecrire("AFEBUD_IDENT", Valeur::chaine(l.parNumero));
+    if (t.modifier() != 0) throw UException("budget line " + l.ligne + " could not be written");
+  }
+}
+
 }  // namespace
 
 int runCheck(Session& s, const std::optional<std::string>& only, bool fix, std::ostream& out) {
@@ -183,9 +223,22 @@ int runCheck(Session& s, const std::optional<std::string>& only, bool fix, std::
   }
   // The links against their pieces, for the whole database (a link may be wrong on any line).
   std::vector<TextRow> pieces = only ? std::vector<TextRow>{} : liensSansPiece();
-  if (drifting.empty() && pieces.empty()) {
+  std::vector<BudgetEcarte> ecartes = budgetsEcartes(only);
+  if (drifting.empty() && pieces.empty() && ecartes.empty()) {
     out << "Every budget line checked matches its links.\n";
     return 0;
+  }
+  if (!ecartes.empty()) {
+    std::vector<TextRow> lignes;
+    for (const auto& e : ecartes) lignes.push_back({e.ligne, e.numero, e.budget, e.parNumero});
+    out << ecartes.size() << " budget line(s) name another budget than their number:\n";
+    printTable(out, {"Line", "Number", "Budget", "Budget by number"}, lignes);
+    if (fix) {
+      Transaction tx(s.db());
+      reparerBudgets(ecartes);
+      tx.commit();
+      out << "Fixed: each now names the budget of its number.\n";
+    }
   }
   if (!drifting.empty()) {
     out << drifting.size() << " budget line(s) differ from their links:\n";

@@ -12,6 +12,10 @@
 // more amount than the piece itself (its lines' quantities and net amounts by the rule every
 // linking path shares, credit notes by absolute value). A fix cannot know which of such links is
 // right: it lists them, leaves them, and the audit exits 1.
+//
+// A budget line whose budget column names another budget than its number says is damaged (the
+// database derives the budget from the number only when the number is written): the audit
+// names it, and a fix gives it the budget of its number.
 #pragma once
 
 #include <iosfwd>

@@ -204,4 +204,29 @@ TEST_F(CliTest, CheckFindsAPlantedDriftAndFixRemovesIt) {
   EXPECT_EQ(quarvo("check").code, 1);  // left as they were
 }
 
+// A budget line whose budget column was changed alone disagrees with its number. Writing its
+// figures no longer rewrites the number, so nothing repairs it by the way: check names it and
+// --fix gives it the budget of its number.
+TEST_F(CliTest, CheckNamesALineWhoseBudgetDisagreesWithItsNumber) {
+  ASSERT_EQ(quarvo("init --demo").code, 0);
+  std::string damage = "sqlite3 " + db_ +
+                       " \"UPDATE AFLBUD SET AFEBUD_IDENT = '0000000202' WHERE IDENT = "
+                       "'0000000211'\"";
+  ASSERT_EQ(system(damage.c_str()), 0);
+  ASSERT_EQ(quarvo("impute").code, 0);  // writes the line's figures
+  Result found = quarvo("check --line 0000000211");
+  EXPECT_EQ(found.code, 1);
+  EXPECT_NE(found.out.find("1 budget line(s) name another budget than their number"),
+            std::string::npos)
+      << found.out;
+  EXPECT_NE(found.out.find("0000000211  0000000201|1  0000000202  0000000201"), std::string::npos)
+      << found.out;
+  EXPECT_EQ(quarvo("check --line 0000000212").code, 0);
+  Result fixed = quarvo("check --fix");
+  EXPECT_NE(fixed.out.find("Fixed: each now names the budget of its number."), std::string::npos)
+      << fixed.out;
+  Result again = quarvo("check");
+  EXPECT_EQ(again.code, 0) << again.out;
+}
+
 }  // namespace
