@@ -1,5 +1,7 @@
 #include "quarvo/imputation/QUARVOImputer_pieces.h"
 
+#include <set>
+#include <string>
 #include <vector>
 
 #include "host/session/Session.h"
@@ -97,6 +99,11 @@ std::string QUARVOImputer_pieces::ecrirePiece(Evt* evt) {
     EvtParamVal cancel{eappr_.valeur("COMPOSANT"), eappr_.valeur("COMPOSANT_IDENT")};
     appelerModule("", "QUARVO", "QUARVO-ANNULER1", &cancel);
   }
+  // From here the piece has no link but those this loop writes: a budget line's figures need
+  // the piece's links withdrawn first only once the loop wrote one there (two lines of the
+  // piece on one budget line); before that there is nothing to withdraw, and the validation
+  // recomputes the line and its results all the same.
+  std::set<std::string> lignesLiees;
   lappr_.chercher(3, "NUMERO", '/', Valeur::chaine(eappr_.valeur("IDENT").toChaine() + "|"));
   lappr_.ouvrir();
   while (lappr_.lire(1) == 0) {
@@ -109,7 +116,9 @@ std::string QUARVOImputer_pieces::ecrirePiece(Evt* evt) {
       if (appeler(*this, "AFAFFA", "LECTURE", {vappr_.valeur("AFAFFA_IDENT")}) != 0) continue;
       if (appeler(*this, "AFLBUD", "LECTURE", {vappr_.valeur("AFLBUD_IDENT")}) != 0) continue;
       if (appeler(*this, "AFPRES", "LECTURE", {iAflbud_.valeur("AFPRES_IDENT")}) != 0) continue;
-      appelerProcedure("", "", "", "SUPPRESSION_MAJ_LIENS", evt, 0);
+      if (!lignesLiees.insert(iAflbud_.valeur("IDENT").toChaine()).second) {
+        appelerProcedure("", "", "", "SUPPRESSION_MAJ_LIENS", evt, 0);
+      }
       appelerProcedure("", "", "", "MAJ_QUARVO", evt, 0);
       appelerProcedure("", "", "", "MAJ_LIENS", evt, 0);
     }
