@@ -367,65 +367,63 @@ double cpu() {
   return static_cast<double>(t.tv_sec) + static_cast<double>(t.tv_nsec) / 1e9;
 }
 
+// Wall and processor time per piece of one run of `faire` on a fresh copy of the starting file.
 struct Mesure {
-  double secondes = 0;  // wall time
+  double secondes = 0;
   double cpu = 0;
 };
-std::map<int64_t, Mesure> plancherParPiece;  // per piece, by size
+template <typename Faire>
+Mesure mesurer(benchmark::State& state, const fs::path& depart, const char* nom, Faire faire) {
+  state.PauseTiming();
+  fs::path db = copie(depart, nom);
+  state.ResumeTiming();
+  auto t0 = Clock::now();
+  double c0 = cpu();
+  faire(db);
+  Mesure m{std::chrono::duration<double>(Clock::now() - t0).count(), cpu() - c0};
+  double pieces = static_cast<double>(state.range(0));
+  m.secondes /= pieces;
+  m.cpu /= pieces;
+  state.counters["ms_per_piece"] = 1000.0 * m.secondes;
+  state.counters["cpu_ms_per_piece"] = 1000.0 * m.cpu;
+  return m;
+}
+
+std::map<int64_t, Mesure> plancherParPiece;  // by size
 
 void BM_Plancher(benchmark::State& state) {
   const int64_t pieces = state.range(0);
   fs::path depart = base(pieces);
-  Mesure m;
   for (auto _ : state) {
-    state.PauseTiming();
-    fs::path db = copie(depart, "plancher.db");
-    state.ResumeTiming();
-    auto t0 = Clock::now();
-    double c0 = cpu();
-    int64_t liens = plancher(db);
-    m.cpu = cpu() - c0;
-    m.secondes = std::chrono::duration<double>(Clock::now() - t0).count();
-    state.counters["links"] = static_cast<double>(liens);
+    plancherParPiece[pieces] = mesurer(state, depart, "plancher.db", [&](const fs::path& db) {
+      state.counters["links"] = static_cast<double>(plancher(db));
+    });
   }
-  m.secondes /= static_cast<double>(pieces);
-  m.cpu /= static_cast<double>(pieces);
-  plancherParPiece[pieces] = m;
-  state.counters["ms_per_piece"] = 1000.0 * m.secondes;
-  state.counters["cpu_ms_per_piece"] = 1000.0 * m.cpu;
 }
 
 void BM_Imputation(benchmark::State& state) {
   const int64_t pieces = state.range(0);
   fs::path depart = base(pieces);
-  Mesure m;
   for (auto _ : state) {
-    state.PauseTiming();
-    fs::path db = copie(depart, "imputation.db");
-    state.ResumeTiming();
-    auto t0 = Clock::now();
-    double c0 = cpu();
-    imputer(db);
-    m.cpu = cpu() - c0;
-    m.secondes = std::chrono::duration<double>(Clock::now() - t0).count();
+    fs::path imputee;
+    Mesure m = mesurer(state, depart, "imputation.db", [&](const fs::path& db) {
+      imputer(db);
+      imputee = db;
+    });
     state.PauseTiming();
     // The floor must have written what the imputation wrote, or its time means nothing.
     fs::path plancherDb = copie(depart, "plancher-controle.db");
     plancher(plancherDb);
-    if (std::string e = ecart(plancherDb, db); !e.empty()) {
+    if (std::string e = ecart(plancherDb, imputee); !e.empty()) {
       state.SkipWithError(e.c_str());
       return;
     }
     state.ResumeTiming();
-  }
-  m.secondes /= static_cast<double>(pieces);
-  m.cpu /= static_cast<double>(pieces);
-  state.counters["ms_per_piece"] = 1000.0 * m.secondes;
-  state.counters["cpu_ms_per_piece"] = 1000.0 * m.cpu;
-  state.counters["pieces_per_s"] = 1.0 / m.secondes;
-  if (auto it = plancherParPiece.find(pieces); it != plancherParPiece.end()) {
-    state.counters["x_floor"] = m.secondes / it->second.secondes;
-    state.counters["x_floor_cpu"] = m.cpu / it->second.cpu;
+    state.counters["pieces_per_s"] = 1.0 / m.secondes;
+    if (auto it = plancherParPiece.find(pieces); it != plancherParPiece.end()) {
+      state.counters["x_floor"] = m.secondes / it->second.secondes;
+      state.counters["x_floor_cpu"] = m.cpu / it->second.cpu;
+    }
   }
 }
 
