@@ -86,6 +86,30 @@ TEST_F(SqliteReadsTest, ReadsInATransactionFollowOwnWritesRollbacksAndOtherConne
   EXPECT_EQ(parNom("c"), "02:5;");  // outside a transaction too
 }
 
+// Inside a transaction a remembered row is shared by the cursors that read it instead of
+// copied: each still keeps the row as it read it while another changes it, and sees the change
+// once it reads the row again.
+TEST_F(SqliteReadsTest, CursorsSharingARememberedRowEachKeepWhatTheyRead) {
+  Transaction tx(t_.db());
+  Table a(nullptr, "VOVOVA", "T_TEST", "A");
+  Table b(nullptr, "VOVOVA", "T_TEST", "B");
+  ASSERT_EQ(a.chercher(3, "IDENT", '=', Valeur::chaine("01")), 0);
+  ASSERT_EQ(b.chercher(3, "IDENT", '=', Valeur::chaine("01")), 0);
+  b.ecrire("N", Valeur::entier(5));
+  ASSERT_EQ(b.modifier(), 0);
+  b.ecrire("N", Valeur::entier(6));  // changed twice while a holds its row
+  ASSERT_EQ(b.modifier(), 0);
+  EXPECT_EQ(a.valeur("N").toChaine(), "1");
+  a.ecrire("NOM", Valeur::chaine("z"));  // a writes only what it changed: b's N stays
+  ASSERT_EQ(a.modifier(), 0);
+  EXPECT_EQ(a.valeur("N").toChaine(), "1");
+  ASSERT_EQ(a.chercher(3, "IDENT", '=', Valeur::chaine("01")), 0);
+  EXPECT_EQ(a.valeur("N").toChaine() + a.valeur("NOM").toChaine(), "6z");
+  tx.commit();
+  EXPECT_EQ(t_.value("T_TEST", "N", "IDENT", "01") + t_.value("T_TEST", "NOM", "IDENT", "01"),
+            "6z");
+}
+
 // A whole small table read without criteria (settings, purchase accounts) is remembered like
 // any selection: it must follow every row added, changed or removed, and another program's.
 TEST_F(SqliteReadsTest, AWholeTableReadWithoutCriteriaFollowsEveryWrite) {

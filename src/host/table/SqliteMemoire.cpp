@@ -34,7 +34,12 @@ void MemoireTable::retenir(const TableSchema& schema, const std::vector<Criterio
   for (RowId id : ids) lignes_.try_emplace(id);
 }
 
-std::optional<Row>* MemoireTable::ligne(RowId id) {
+Row& MemoireTable::aChanger(std::shared_ptr<Row>& entree) {
+  if (entree.use_count() > 1) entree = std::make_shared<Row>(*entree);
+  return *entree;
+}
+
+std::shared_ptr<Row>* MemoireTable::ligne(RowId id) {
   auto it = lignes_.find(id);
   return it == lignes_.end() ? nullptr : &it->second;
 }
@@ -56,8 +61,9 @@ void MemoireTable::vider() {
   lignes_.clear();
 }
 
-void MemoireTable::tenir(RowId id, Row& memoire, const std::vector<size_t>& ecrites,
+void MemoireTable::tenir(RowId id, std::shared_ptr<Row>& entree, const std::vector<size_t>& ecrites,
                          std::vector<Valeur> valeurs) {
+  Row& memoire = aChanger(entree);
   std::vector<bool>& colonnes = enAttente_[id];
   colonnes.resize(memoire.values.size(), false);
   for (size_t k = 0; k < ecrites.size(); ++k) {

@@ -7,9 +7,12 @@
 // their criteria) and the rows they gave are remembered, and some updates of remembered rows
 // wait in the row itself until the store writes them. MemoireTable only keeps that memory: the
 // SqliteStore that owns it decides what may be remembered or held and when it is forgotten or
-// written, and runs the SQL. Rows handed out are copies; the memory owns its rows.
+// written, and runs the SQL. A remembered row is shared with the cursors that read it: the
+// memory never changes a row a cursor still holds, it changes a copy of it (a cursor keeps the
+// row as it read it, as when it had copied it).
 #pragma once
 
+#include <memory>
 #include <optional>
 #include <string>
 #include <unordered_map>
@@ -41,7 +44,10 @@ class MemoireTable {
                const std::string& cle, const std::vector<RowId>& ids);
 
   // The entry of a row to remember (empty until fetched), or null when it is not one.
-  std::optional<Row>* ligne(RowId id);
+  std::shared_ptr<Row>* ligne(RowId id);
+  // The row of `entree` (an entry of this memory) made the memory's own, to be changed: copied
+  // first when a cursor shares it.
+  static Row& aChanger(std::shared_ptr<Row>& entree);
   // Whether writing `ecrites` from `apres` over the remembered `avant` changes a column some
   // remembered selection selects on.
   bool changeUnCritere(const TableSchema& schema, const Row& avant, const Row& apres,
@@ -54,7 +60,7 @@ class MemoireTable {
 
   // Holds an update of the remembered row `memoire` (an entry of this memory): its columns
   // `ecrites` take `valeurs` now, and are noted to be written later.
-  void tenir(RowId id, Row& memoire, const std::vector<size_t>& ecrites,
+  void tenir(RowId id, std::shared_ptr<Row>& memoire, const std::vector<size_t>& ecrites,
              std::vector<Valeur> valeurs);
   // The updates held, handed over to be written; the memory holds none after.
   EnAttente prendreEnAttente();
@@ -65,7 +71,7 @@ class MemoireTable {
  private:
   std::unordered_map<std::string, std::vector<RowId>> selections_;
   // A row is remembered once fetched; an empty entry is a row to remember on its next fetch.
-  std::unordered_map<RowId, std::optional<Row>> lignes_;
+  std::unordered_map<RowId, std::shared_ptr<Row>> lignes_;
   std::vector<bool> colonnesCritere_;  // columns some remembered selection selects on
   EnAttente enAttente_;
 };

@@ -78,7 +78,7 @@ void SqliteStore::ecrireEnAttente() {
   if (!memoire_.tientDesMises()) return;
   MemoireTable::EnAttente lignes = memoire_.prendreEnAttente();
   for (const auto& [id, colonnes] : lignes) {
-    std::optional<Row>* retenue = memoire_.ligne(id);
+    std::shared_ptr<Row>* retenue = memoire_.ligne(id);
     if (retenue == nullptr || !*retenue) {
       throw UException("update of " + name_ + " lost before it was written");  // cannot be
     }
@@ -151,17 +151,23 @@ std::vector<RowId> SqliteStore::lireSelection(const std::vector<Criterion>& crit
 }
 
 bool SqliteStore::fetch(RowId id, Row& out) {
-  std::optional<Row>* retenue = nullptr;
-  if (db_.memoireActive()) {
-    retenue = memoire_.ligne(id);
-    if (retenue != nullptr && *retenue) {
-      out = **retenue;
-      return true;
-    }
+  if (auto partagee = this->partagee(id)) {
+    out = *partagee;
+    return true;
   }
-  if (!lireLigne(id, out)) return false;
-  if (retenue != nullptr) *retenue = out;
-  return true;
+  return lireLigne(id, out);
+}
+
+std::shared_ptr<const Row> SqliteStore::partagee(RowId id) {
+  if (!db_.memoireActive()) return nullptr;
+  std::shared_ptr<Row>* retenue = memoire_.ligne(id);
+  if (retenue == nullptr) return nullptr;
+  if (!*retenue) {
+    auto lue = std::make_shared<Row>();
+    if (!lireLigne(id, *lue)) return nullptr;
+    *retenue = std::move(lue);
+  }
+  return *retenue;
 }
 
 bool SqliteStore::lireLigne(RowId id, Row& out) {
@@ -212,7 +218,7 @@ void SqliteStore::update(RowId id, const Row& row, const std::vector<bool>& chan
   if (ecrites.empty()) return;
   bool declenche = description_.declencheTout;
   for (size_t i : ecrites) declenche = declenche || description_.declencheurs[i];
-  std::optional<Row>* retenue = memoire_.ligne(id);
+  std::shared_ptr<Row>* retenue = memoire_.ligne(id);
   // A remembered selection stays right when no column it selects on changes, and no trigger
   // fires (it might change any column behind our back).
   if (declenche || retenue == nullptr || !*retenue ||
@@ -232,7 +238,7 @@ void SqliteStore::update(RowId id, const Row& row, const std::vector<bool>& chan
     std::vector<Valeur> valeurs;
     valeurs.reserve(ecrites.size());
     for (size_t i : ecrites) valeurs.push_back(ajustee(row, i));
-    memoire_.tenir(id, **retenue, ecrites, std::move(valeurs));
+    memoire_.tenir(id, *retenue, ecrites, std::move(valeurs));
     db_.noterEnAttente(this);
     return;
   }
@@ -240,13 +246,14 @@ void SqliteStore::update(RowId id, const Row& row, const std::vector<bool>& chan
   // The remembered row is forgotten until the write is done, then updated in place when no
   // trigger ran; otherwise it is read again on its next fetch.
   retenue = memoire_.ligne(id);
-  std::optional<Row> avant;
+  std::shared_ptr<Row> avant;
   if (retenue != nullptr) avant.swap(*retenue);
   executerUpdate(id, row, ecrites);
   if (avant && !declenche) {
+    Row& memoire = MemoireTable::aChanger(avant);
     for (size_t i : ecrites) {
-      avant->values[i] = ajustee(row, i);
-      avant->remplie(i);
+      memoire.values[i] = ajustee(row, i);
+      memoire.remplie(i);
     }
     retenue = memoire_.ligne(id);
     if (retenue != nullptr) *retenue = std::move(avant);

@@ -34,6 +34,7 @@ class SqliteStore : public TableStore {
   std::optional<std::vector<RowId>> selectTriee(const std::vector<Criterion>& criteria,
                                                 const std::vector<std::string>& tri) override;
   bool fetch(RowId id, Row& out) override;
+  std::shared_ptr<const Row> partagee(RowId id) override;
   RowId insert(const Row& row) override;
   void update(RowId id, const Row& row, const std::vector<bool>& changees) override;
   void remove(RowId id) override;

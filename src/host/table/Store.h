@@ -90,6 +90,13 @@ class TableStore {
     return std::nullopt;
   }
   virtual bool fetch(RowId id, Row& out) = 0;
+  // The row `id` shared with what the store remembers instead of copied, or null when the store
+  // remembers no such row (the caller then fetches a copy). A shared row never changes under
+  // its holder: the store changes a copy of it.
+  virtual std::shared_ptr<const Row> partagee(RowId id) {
+    (void)id;
+    return nullptr;
+  }
   virtual RowId insert(const Row& row) = 0;
   // Writes the columns flagged in `changees` (those the caller changed since it read the row);
   // an empty mask writes every column.

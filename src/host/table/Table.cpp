@@ -71,7 +71,19 @@ bool Table::ouvrirTrie(const std::vector<std::string>& tri) {
 void Table::load(RowId id) {
   current_ = id;
   changees_.clear();
+  // A row the store remembers is read where it is; it is copied into the buffer only when the
+  // cursor writes into it.
+  partagee_ = store().partagee(id);
+  if (partagee_) return;
   if (!store().fetch(id, buffer_)) current_ = 0;
+}
+
+Row& Table::ecrivable() {
+  if (partagee_) {
+    buffer_ = *partagee_;
+    partagee_.reset();
+  }
+  return buffer_;
 }
 
 int Table::aller(RowId id) {
@@ -113,6 +125,7 @@ int Table::chercher(int mode, const std::string& column, char op, const Valeur& 
 
 void Table::preparer() {
   current_ = 0;
+  partagee_.reset();
   const auto& cols = store().schema().columns();
   buffer_.values.clear();
   buffer_.nulles.clear();
@@ -123,7 +136,7 @@ void Table::preparer() {
 int Table::inserer() {
   if (isRecord_) return 1;
   try {
-    current_ = store().insert(buffer_);
+    current_ = store().insert(ligne());
     changees_.clear();
   } catch (const ConstraintError&) {
     return 1;
@@ -137,7 +150,7 @@ int Table::modifier() {
   try {
     // A full-width mask: an empty one would mean every column.
     changees_.resize(store().schema().columns().size(), false);
-    store().update(current_, buffer_, changees_);
+    store().update(current_, ligne(), changees_);
     changees_.clear();
   } catch (const ConstraintError&) {
     return 1;
@@ -170,7 +183,7 @@ int64_t Table::compter() {
 
 const Row& Table::ligne() {
   if (isRecord_) return static_cast<MemoryStore&>(store()).firstRow();
-  return buffer_;
+  return partagee_ ? *partagee_ : buffer_;
 }
 
 Valeur Table::valeur(std::string_view column) {
@@ -194,7 +207,7 @@ bool Table::ecrire(std::string_view column, const Valeur& value) {
   }
   auto fitted = fitColumn(s.schema().columns()[*i], value);
   if (!fitted) return false;
-  Row& row = isRecord_ ? static_cast<MemoryStore&>(s).firstRow() : buffer_;
+  Row& row = isRecord_ ? static_cast<MemoryStore&>(s).firstRow() : ecrivable();
   if (row.values.size() <= *i) {
     size_t from = row.values.size();
     row.values.resize(s.schema().columns().size());

@@ -11,6 +11,7 @@
 #pragma once
 
 #include <filesystem>
+#include <memory>
 #include <string>
 #include <string_view>
 #include <vector>
@@ -82,6 +83,8 @@ class Table {
  private:
   Session& session();
   void load(RowId id);
+  // The current row, to be written: the shared row copied into the buffer first.
+  Row& ecrivable();
 
   Automate* owner_;
   std::string base_;
@@ -95,7 +98,8 @@ class Table {
   size_t position_ = 0;  // next index of the selection for mode 1
   RowId current_ = 0;
   Row buffer_;
-  std::vector<bool> changees_;  // columns written since the row was read or prepared
+  std::shared_ptr<const Row> partagee_;  // the current row as the store remembers it, unwritten
+  std::vector<bool> changees_;           // columns written since the row was read or prepared
   char lock_ = 0;
 };
 
