@@ -79,6 +79,12 @@ int Table::aller(RowId id) {
   return current_ != 0 ? 0 : 1;
 }
 
+void Table::poserLigne(RowId id, Row&& row) {
+  current_ = id;
+  changees_.clear();
+  buffer_ = std::move(row);
+}
+
 int Table::lire(int mode, char) {
   if (isRecord_) return static_cast<MemoryStore&>(store()).size() > 0 ? 0 : 1;
   if (!open_) ouvrir();

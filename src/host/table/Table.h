@@ -67,6 +67,9 @@ class Table {
   // The row id of the current row, and positioning on a row id of this table.
   RowId courantId() const { return current_; }
   int aller(RowId id);
+  // Makes `row`, row `id` of this table read elsewhere (a join's part of it), the current row,
+  // as `aller(id)` would without reading it again.
+  void poserLigne(RowId id, Row&& row);
 
   bool courante() const { return current_ != 0 || isRecord_; }
   Valeur valeur(std::string_view column);
