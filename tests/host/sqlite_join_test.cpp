@@ -78,6 +78,23 @@ TEST_F(SqliteJoinTest, RowsComeGroupedInKeyOrderTiedFilteredAndTyped) {
   EXPECT_THROW(t_.db().joindre(enAvant), UException);
 }
 
+TEST_F(SqliteJoinTest, ColumnsNotAskedForReadAsDefaultsAndAPartTakenIsReadAgain) {
+  Jointure j = jointure();
+  j.tables[1].colonnes = {"IDENT", "MONTANT"};
+  auto c = t_.db().joindre(j);
+  ASSERT_TRUE(c->suivant());
+  EXPECT_EQ(c->ligne(1).values[2].toChaine(), "");  // NUMERO, not asked for
+  EXPECT_EQ(c->ligne(1).values[3].asMonnaie().text(), "1.00");
+  Row pere = std::move(c->ligne(0));
+  EXPECT_EQ(pere.values[0].toChaine(), "P1");
+  ASSERT_TRUE(c->suivant());  // the same father and child: the father is read again
+  EXPECT_EQ(c->ligne(0).values[0].toChaine(), "P1");
+  EXPECT_EQ(c->ligne(1).values[0].toChaine(), "F1");
+  EXPECT_EQ(c->ligne(2).values[0].toChaine(), "L2");
+  j.tables[1].colonnes = {"AUCUNE"};
+  EXPECT_THROW(t_.db().joindre(j), UException);
+}
+
 TEST_F(SqliteJoinTest, AReadOfOneMomentSeesNoLaterWriteAndHoldsNoWriterBack) {
   SqliteDatabase autre(t_.dir() / "test.db", false);
   autre.delaiAttente(std::chrono::milliseconds(100));

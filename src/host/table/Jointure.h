@@ -44,6 +44,8 @@ struct TableJointe {
   std::vector<LienJointure> liens;
   std::vector<Criterion> criteres;
   bool facultative = false;
+  // The columns read; the others read as their kind's default. Empty: every column.
+  std::vector<std::string> colonnes = {};
 };
 
 struct Jointure {
@@ -60,8 +62,9 @@ class CurseurJoint {
   // The row id of table `t`'s part of the current row. REQUIRES: presente(t).
   virtual RowId id(size_t t) const = 0;
   // Table `t`'s part of the current row, every column of its schema in its kind. The cursor
-  // keeps it until the next `suivant`; a caller that keeps it longer may take it (moved out),
-  // after which it reads empty. REQUIRES: presente(t).
+  // keeps it until the next `suivant`, and over the rows where that part stays the same row;
+  // a caller that keeps it longer may take it (moved out): it is read again on the next
+  // `suivant`. REQUIRES: presente(t).
   virtual Row& ligne(size_t t) = 0;
 };
 

@@ -33,12 +33,18 @@ RequeteJointe construireJointure(const Jointure& jointure,
     std::string alias = "t" + std::to_string(t);
     auto q = [&](const std::string& a, const ColumnInfo& c) { return a + "." + sqlIdent(c.name); };
 
-    RequeteJointe::Partie partie{s->name(), {}, tj.facultative && t > 0};
+    RequeteJointe::Partie partie{s->name(), {}, {}, tj.facultative && t > 0};
     select += (t == 0 ? "" : ", ") + alias + ".rowid";
-    for (const auto& c : s->schema().columns()) {
-      select += ", " + q(alias, c);
-      partie.colonnes.push_back(c.kind);
+    for (const auto& c : s->schema().columns()) partie.colonnes.push_back(c.kind);
+    if (tj.colonnes.empty()) {
+      for (size_t i = 0; i < partie.colonnes.size(); ++i) partie.lues.push_back(i);
+    } else {
+      for (const auto& name : tj.colonnes) {
+        colonne(*s, name);  // known, or the fault names it
+        partie.lues.push_back(*s->schema().index(name));
+      }
     }
+    for (size_t i : partie.lues) select += ", " + q(alias, s->schema().columns()[i]);
     r.parties.push_back(std::move(partie));
     for (size_t k : s->schema().key()) ordre += q(alias, s->schema().columns()[k]) + ", ";
     ordre += alias + ".rowid, ";
@@ -114,19 +120,31 @@ bool SqliteCurseurJoint::suivant() {
   for (size_t t = 0; t < requete_.parties.size(); ++t) {
     const auto& partie = requete_.parties[t];
     bool presente = sqlite3_column_type(st_, i) != SQLITE_NULL;
-    presentes_[t] = presente;
-    ids_[t] = presente ? sqlite3_column_int64(st_, i) : 0;
-    ++i;
+    RowId id = presente ? sqlite3_column_int64(st_, i) : 0;
     Row& ligne = lignes_[t];
-    ligne.values.resize(partie.colonnes.size());
-    for (size_t c = 0; c < partie.colonnes.size(); ++c, ++i) {
-      if (!presente) continue;
+    const bool entiere = ligne.values.size() == partie.colonnes.size();
+    // A parent's part repeats over its children's rows: it is read once, unless the caller
+    // took it.
+    const bool dejaLue = presente && presentes_[t] && ids_[t] == id && entiere;
+    presentes_[t] = presente;
+    ids_[t] = id;
+    ++i;
+    if (!presente || dejaLue) {
+      i += static_cast<int>(partie.lues.size());
+      continue;
+    }
+    if (!entiere) {
+      ligne.values.clear();
+      for (ColKind k : partie.colonnes) ligne.values.push_back(defaultOf(k));
+    }
+    for (size_t c : partie.lues) {
       if (!readColumn(st_, i, partie.colonnes[c], ligne.values[c])) {
         const unsigned char* texte = sqlite3_column_text(st_, i);
         throw UException(partie.table + ": stored value '" +
                          (texte ? reinterpret_cast<const char*>(texte) : "") +
                          "' does not read in its column's kind");
       }
+      ++i;
     }
   }
   return true;

@@ -25,7 +25,8 @@ class SqliteStore;
 struct RequeteJointe {
   struct Partie {
     std::string table;
-    std::vector<ColKind> colonnes;
+    std::vector<ColKind> colonnes;  // of the schema, every one
+    std::vector<size_t> lues;       // the positions of the columns the query reads, in order
     bool facultative = false;
   };
   std::string sql;

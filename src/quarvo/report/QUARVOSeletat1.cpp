@@ -341,12 +341,20 @@ void QUARVOSeletat1::traiter_table_afebud(Evt*) {
                        LienJointure::commencePar("NUMERO", kBudget, "IDENT", "|")},
                       {},
                       false});
+  // Of a link and a piece header, only what the rows take.
   j.tables.push_back({"QUARVO",
                       {LienJointure::egal("AFLBUD_IDENT", kLigne, "IDENT")},
                       {{"DATE_PIECE", '-', vdatemax_.value()}},
-                      true});
+                      true,
+                      {"IDENT", "DATE_PIECE", "COMPOSANT", "PIECE", "HT"}});
   for (const char* entete : {"GAPECOM", "GAPEBL", "GAPEFAC"}) {
-    j.tables.push_back({entete, {LienJointure::egal("IDENT", kLien, "COMPOSANT_IDENT")}, {}, true});
+    std::vector<std::string> colonnes{"DESIG", "ORIGINE"};
+    if (std::string(entete) == "GAPEFAC") colonnes.push_back("TYPE");
+    j.tables.push_back({entete,
+                        {LienJointure::egal("IDENT", kLien, "COMPOSANT_IDENT")},
+                        {},
+                        true,
+                        std::move(colonnes)});
   }
   auto lignes = session().db().joindre(j);
   RowId budget = 0;
