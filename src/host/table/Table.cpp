@@ -71,7 +71,19 @@ bool Table::ouvrirTrie(const std::vector<std::string>& tri) {
 void Table::load(RowId id) {
   current_ = id;
   changees_.clear();
+  partagee_ = store().partagee(id);
+  if (partagee_) return;
   if (!store().fetch(id, buffer_)) current_ = 0;
+}
+
+void Table::detacher() {
+  if (!partagee_) return;
+  buffer_ = *partagee_;
+  partagee_.reset();
+  const auto& cols = store().schema().columns();
+  for (size_t i = buffer_.values.size(); i < cols.size(); ++i) {
+    buffer_.values.push_back(defaultOf(cols[i].kind));
+  }
 }
 
 int Table::aller(RowId id) {
@@ -80,6 +92,7 @@ int Table::aller(RowId id) {
 }
 
 void Table::poserLigne(RowId id, Row&& row) {
+  partagee_.reset();
   current_ = id;
   changees_.clear();
   buffer_ = std::move(row);
@@ -118,6 +131,7 @@ int Table::chercher(int mode, const std::string& column, char op, const Valeur& 
 }
 
 void Table::preparer() {
+  partagee_.reset();
   current_ = 0;
   const auto& cols = store().schema().columns();
   buffer_.values.clear();
@@ -127,9 +141,12 @@ void Table::preparer() {
 
 int Table::inserer() {
   if (isRecord_) return 1;
+  detacher();
   try {
-    current_ = store().insert(buffer_);
+    current_ = store().adopt(std::move(buffer_));
     changees_.clear();
+    // A memory table took the buffer: its row is read where it is from now on.
+    partagee_ = store().partagee(current_);
   } catch (const ConstraintError&) {
     return 1;
   }
@@ -139,6 +156,7 @@ int Table::inserer() {
 int Table::modifier() {
   if (isRecord_) return 0;
   if (current_ == 0) return 1;
+  if (partagee_) return 0;  // nothing written since the row was read
   try {
     // A full-width mask: an empty one would mean every column.
     changees_.resize(store().schema().columns().size(), false);
@@ -175,19 +193,23 @@ int64_t Table::compter() {
 
 const Row& Table::ligne() {
   if (isRecord_) return static_cast<MemoryStore&>(store()).firstRow();
+  detacher();  // whole, as the schema has it
   return buffer_;
 }
 
-Valeur Table::valeur(std::string_view column) {
+const Valeur& Table::valeur(std::string_view column) {
+  static const Valeur aucune;
   TableStore& s = store();
   auto i = s.schema().index(column);
   if (!i) {
-    if (s.extensible()) return Valeur();
+    if (s.extensible()) return aucune;
     throw UException("table " + name_ + " has no column " + std::string(column));
   }
-  const Row& row = ligne();
+  const Row& row = isRecord_   ? static_cast<MemoryStore&>(s).firstRow()
+                   : partagee_ ? *partagee_
+                               : buffer_;
   if (*i < row.values.size()) return row.values[*i];
-  return defaultOf(s.schema().columns()[*i].kind);
+  return defautDe(s.schema().columns()[*i].kind);
 }
 
 bool Table::ecrire(std::string_view column, const Valeur& value) {
@@ -199,6 +221,7 @@ bool Table::ecrire(std::string_view column, const Valeur& value) {
   }
   auto fitted = fitColumn(s.schema().columns()[*i], value);
   if (!fitted) return false;
+  detacher();
   Row& row = isRecord_ ? static_cast<MemoryStore&>(s).firstRow() : buffer_;
   if (row.values.size() <= *i) {
     size_t from = row.values.size();

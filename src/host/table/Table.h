@@ -11,6 +11,7 @@
 #pragma once
 
 #include <filesystem>
+#include <memory>
 #include <string>
 #include <string_view>
 #include <vector>
@@ -72,7 +73,9 @@ class Table {
   void poserLigne(RowId id, Row&& row);
 
   bool courante() const { return current_ != 0 || isRecord_; }
-  Valeur valeur(std::string_view column);
+  // The value of a column of the current row; it stays valid until the cursor moves or is
+  // written to.
+  const Valeur& valeur(std::string_view column);
   // Writes into the current row buffer, converted to the column's kind; false when it does not
   // convert or the column does not exist.
   bool ecrire(std::string_view column, const Valeur& value);
@@ -85,6 +88,8 @@ class Table {
  private:
   Session& session();
   void load(RowId id);
+  // Makes the row read in place the cursor's own buffer, before a write.
+  void detacher();
 
   Automate* owner_;
   std::string base_;
@@ -98,6 +103,8 @@ class Table {
   size_t position_ = 0;  // next index of the selection for mode 1
   RowId current_ = 0;
   Row buffer_;
+  // The current row as a memory table holds it, read in place (then `buffer_` is not used).
+  std::shared_ptr<const Row> partagee_;
   std::vector<bool> changees_;  // columns written since the row was read or prepared
   char lock_ = 0;
 };
