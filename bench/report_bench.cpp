@@ -5,8 +5,10 @@
 // before the period), i.e. 200 rows of "M_APPR1" per project: per line its own row, the row of
 // the earlier pieces and 18 piece rows. A second company of 100 projects is generated beside it.
 //
-//   report_bench [--benchmark_filter=...] [--projects=N]
+//   report_bench [--benchmark_filter=...] [--projects=N] [--keep]
+//   report_bench --etape=plancher|texte|xlsx|pdf|trois [--projects=N]   (one step, to profile)
 //
+// --keep leaves the generated companies in the temporary folder, for the one-step form.
 // The floor is one prepared SELECT through the SQLite C API joining projects, budgets, lines,
 // links and the pieces' headers in the report's order, written as tab-separated text. Each step
 // then runs the report as the command does (app::runReport, through the screen model): the
@@ -202,8 +204,16 @@ Mesure mesurer(const std::string& etape, int n) {
   return m;
 }
 
+// The best of three runs: the floor is short, and the machine may be busy with other work.
 double plancherSecondes() {
-  static double s = mesurer("plancher", projets).secondes;
+  static double s = [] {
+    double best = 0;
+    for (int i = 0; i < 3; ++i) {
+      double t = mesurer("plancher", projets).secondes;
+      if (t > 0 && (best == 0 || t < best)) best = t;
+    }
+    return best;
+  }();
   return s;
 }
 
@@ -251,10 +261,12 @@ BENCHMARK(BM_TroisSorties)->Unit(benchmark::kSecond)->Iterations(1)->UseManualTi
 
 int main(int argc, char** argv) {
   std::string etapeDemandee;
+  bool garder = false;
   for (int i = 1; i < argc; ++i) {
     std::string a = argv[i];
     if (a.rfind("--projects=", 0) == 0) projets = std::stoi(a.substr(11));
     if (a.rfind("--etape=", 0) == 0) etapeDemandee = a.substr(8);
+    if (a == "--keep") garder = true;
   }
   if (!etapeDemandee.empty()) return enfant(etapeDemandee, projets);
   programme = fs::read_symlink("/proc/self/exe").string();
@@ -265,6 +277,6 @@ int main(int argc, char** argv) {
   benchmark::Initialize(&argc, argv);
   benchmark::RunSpecifiedBenchmarks();
   benchmark::Shutdown();
-  fs::remove_all(dossier());
+  if (!garder) fs::remove_all(dossier());
   return 0;
 }
