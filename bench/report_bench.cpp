@@ -22,6 +22,7 @@
 
 #include <chrono>
 #include <cstdio>
+#include <cstdlib>
 #include <filesystem>
 #include <fstream>
 #include <map>
@@ -184,6 +185,12 @@ int enfant(const std::string& etape, int n) {
       etape == "plancher" ? plancher(base, dossier() / "plancher.txt") : rapport(base, etape);
   std::chrono::duration<double> duree = std::chrono::steady_clock::now() - debut;
   std::printf("%.6f %.1f %lld\n", duree.count(), pointeMb(), static_cast<long long>(lignes));
+  if (std::getenv("QUARVO_BENCH_RSS") != nullptr) {
+    std::ifstream status("/proc/self/status");
+    for (std::string l; std::getline(status, l);) {
+      if (l.rfind("Rss", 0) == 0) std::fprintf(stderr, "%s\n", l.c_str());
+    }
+  }
   return lignes < 0 ? 1 : 0;
 }
 
