@@ -213,14 +213,23 @@ const Valeur& Table::valeur(std::string_view column) {
 }
 
 bool Table::ecrire(std::string_view column, const Valeur& value) {
+  Valeur copie = value;
+  return ecrire(column, std::move(copie));
+}
+
+bool Table::ecrire(std::string_view column, Valeur&& value) {
   TableStore& s = store();
   auto i = s.schema().index(column);
   if (!i) {
     if (!s.extensible()) return false;
     i = s.schema().add({std::string(column), colKindOfValue(value.kind())});
   }
-  auto fitted = fitColumn(s.schema().columns()[*i], value);
-  if (!fitted) return false;
+  const ColumnInfo& col = s.schema().columns()[*i];
+  if (value.kind() != valueKindOf(col.kind)) {
+    auto fitted = fitColumn(col, value);
+    if (!fitted) return false;
+    value = std::move(*fitted);
+  }
   detacher();
   Row& row = isRecord_ ? static_cast<MemoryStore&>(s).firstRow() : buffer_;
   if (row.values.size() <= *i) {
@@ -230,7 +239,7 @@ bool Table::ecrire(std::string_view column, const Valeur& value) {
       row.values[k] = defaultOf(s.schema().columns()[k].kind);
     }
   }
-  row.values[*i] = std::move(*fitted);
+  row.values[*i] = std::move(value);
   if (!isRecord_) {
     if (changees_.size() <= *i) changees_.resize(s.schema().columns().size(), false);
     changees_[*i] = true;

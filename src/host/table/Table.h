@@ -79,6 +79,8 @@ class Table {
   // Writes into the current row buffer, converted to the column's kind; false when it does not
   // convert or the column does not exist.
   bool ecrire(std::string_view column, const Valeur& value);
+  // The same, taking the value when it is already of the column's kind.
+  bool ecrire(std::string_view column, Valeur&& value);
   const Row& ligne();
 
   TableStore& store();

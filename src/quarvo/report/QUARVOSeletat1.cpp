@@ -437,7 +437,7 @@ void QUARVOSeletat1::creer_tri(Evt* evt) {
   auto found = lignes_.find(key);
   if (found == lignes_.end() || mAppr1_.aller(found->second) != 0) {
     mAppr1_.preparer();
-    auto put = [this](const char* column, Valeur v) { mAppr1_.ecrire(column, v); };
+    auto put = [this](const char* column, Valeur v) { mAppr1_.ecrire(column, std::move(v)); };
     std::string numero = lbudNumero_.text();
     put("IDENT", Valeur::chaine(key));
     put("CRITERE", Valeur::chaine(vcritere_.text()));
