@@ -120,6 +120,10 @@ TEST_F(SqliteJoinTest, AReadOfOneMomentSeesNoLaterWriteAndHoldsNoWriterBack) {
   auto c = t_.db().joindre(jointure());
   EXPECT_EQ(lire(*c), "P1 F1 7.00 L1;P1 F1 7.00 L2;P1 F3 3.10 -;P2 F2 8.00 -;");
 
+  {
+    Lecture lecture(t_.db());
+    EXPECT_THROW(Transaction(t_.db()), UException);
+  }
   // Inside a transaction, a read of one moment is part of it.
   Transaction tx(t_.db());
   {

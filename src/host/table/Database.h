@@ -37,7 +37,8 @@ class Database {
   // A read of one moment (prefer the RAII Lecture below). From its first read to
   // finirLecture, every read sees the database as it was then, whatever other connections
   // commit meanwhile, and it takes no lock that would make them wait. Inside a transaction it
-  // is part of that transaction. REQUIRES: nothing written until finirLecture.
+  // is part of that transaction. REQUIRES: nothing written until finirLecture (a transaction
+  // begun inside a read that is not part of one is a runtime fault).
   virtual void commencerLecture() = 0;
   virtual void finirLecture() = 0;
   // Runs a join (see Jointure.h). Throws UException for an unknown table or column.

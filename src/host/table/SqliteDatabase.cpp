@@ -274,6 +274,10 @@ std::unique_ptr<CurseurJoint> SqliteDatabase::joindre(const Jointure& jointure) 
 }
 
 void SqliteDatabase::begin() {
+  if (!lectures_.empty() && lectures_.front()) {
+    // Its writes would wait for the read to end, and fail if another connection wrote since.
+    throw UException("a transaction inside a read of one moment");
+  }
   ecrireEnAttente();  // what waits belongs to the enclosing level
   if (depth_ == 0) {
     executer("BEGIN IMMEDIATE");
