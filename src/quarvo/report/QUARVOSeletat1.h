@@ -10,9 +10,9 @@
 // one line add up in one row. The budgets of a project, their lines, the lines' links and the
 // linked pieces' headers are read in one join, and the whole table is built from one moment of
 // the database: other users go on writing meanwhile, the report sees none of it (the export
-// reads its labels in that same moment; the printing, launched after it, reads its own). The
-// table then goes to the export ("QUARVO-EXPETAT1") or to the printing ("QUARVO-IMPETAT1"),
-// and the export file name is kept as the user's preference.
+// reads its labels in that same moment; the printing, launched after it, reads them as it
+// goes). The table then goes to the export ("QUARVO-EXPETAT1") or to the printing
+// ("QUARVO-IMPETAT1"), and the export file name is kept as the user's preference.
 //
 // Refusals: no part of the report chosen (message "99"); the period's end after the current
 // fiscal year (message "100" with that year's end); no end date (message "65"); one project
