@@ -176,5 +176,72 @@ TEST(ReportEngineTest, AmountsPrintTheFrenchWay) {
   EXPECT_EQ(report::texteMontant(*Monnaie::parse("-1000")), "-1\u00A0000,00");
 }
 
+// The same group totals over "M_ESSAI", as a part with body bands (a sorted walk; its body
+// never prints) or as a part of totals only (one pass over the table).
+Etat totaux(const std::string& nom, bool corps) {
+  Etat e;
+  e.nom = nom;
+  e.pied = "'pied'";
+  Partie p;
+  p.table = "M_ESSAI";
+  p.tri = {"GRP", "NUM"};
+  p.colonnes = {{"Libellé", 150}, {"Montant", 30, Alignement::Droite}};
+  Niveau n;
+  n.rupture = "GRP";
+  Bande h;
+  h.cellules = {"'Groupe ' & GRP & ' ouvert sur ' & LIB"};
+  h.pleineLargeur = true;
+  n.debut = {h};
+  Bande f;
+  f.cellules = {"'Total ' & GRP & ' fermé sur ' & LIB", "+MONTANT"};
+  n.fin = {f};
+  p.niveaux = {n};
+  if (corps) {
+    Bande jamais;
+    jamais.cellules = {"LIB"};
+    jamais.condition = "V_JAMAIS";
+    p.corps = {jamais};
+  }
+  Bande total;
+  total.cellules = {"'Total général'", "+MONTANT"};
+  p.total = {total};
+  e.parties = {p};
+  return e;
+}
+const report::EnregistrementEtat parRangs(totaux("ESSAI_RANGS", true));
+const report::EnregistrementEtat totauxSeuls(totaux("ESSAI_TOTAUX", false));
+
+TEST(ReportEngineTest, APartOfTotalsOnlyPrintsWhatTheSortedWalkPrints) {
+  Essai e;
+  // Out of order, with ties on the sort: the first inserted of equal rows comes first.
+  e.ligne("B", 7, "b-seul", 700);
+  e.ligne("A", 2, "a-deux-premier", 200);
+  e.ligne("A", 1, "a-un", 100);
+  e.ligne("A", 2, "a-deux-second", 250);
+  e.ligne("C", 3, "c-trois", -300);
+  e.ligne("C", 3, "c-trois-bis", 5);
+  auto imprimer = [&](const std::string& nom, std::string& trace) {
+    Edition_etat a(nullptr);
+    a.nomEtat(nom);
+    a.chaine("V_JAMAIS", "", "");
+    Table m(&a, "VOVOVA", "M_ESSAI", "");
+    a.addBranch("LST_DEBUT1", [&](Evt*) { trace += "D" + m.valeur("LIB").toChaine() + " "; });
+    a.addBranch("LST_FIN1_IMPRIME", [&](Evt*) { trace += "F" + m.valeur("LIB").toChaine() + " "; });
+    a.executer(nullptr);
+    return pdfTexte(e.pdf);
+  };
+  std::string traceRangs;
+  std::string traceTotaux;
+  std::string rangs = imprimer("ESSAI_RANGS", traceRangs);
+  std::string seuls = imprimer("ESSAI_TOTAUX", traceTotaux);
+  EXPECT_EQ(traceRangs, "Da-un Fa-deux-second Db-seul Fb-seul Dc-trois Fc-trois-bis ");
+  EXPECT_EQ(traceTotaux, traceRangs);
+  EXPECT_EQ(seuls, rangs);
+  EXPECT_NE(seuls.find("Groupe A ouvert sur a-un"), std::string::npos);
+  EXPECT_NE(seuls.find("Total A fermé sur a-deux-second 5,50"), std::string::npos);
+  EXPECT_NE(seuls.find("Total C fermé sur c-trois-bis -2,95"), std::string::npos);
+  EXPECT_NE(seuls.find("Total général 9,55"), std::string::npos);
+}
+
 }  // namespace
 }  // namespace quarvo::host

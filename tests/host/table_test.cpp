@@ -87,6 +87,35 @@ TEST_P(CursorTest, ValuesKeepTheirKindAndWritesPersist) {
 
 INSTANTIATE_TEST_SUITE_P(SqliteAndMemory, CursorTest, ::testing::Values("T_TEST", "M_TEST"));
 
+// A memory table lends its rows to the cursors instead of copying them: a cursor must still
+// keep the row as it read it, as a copy would.
+TEST_P(CursorTest, ACursorKeepsTheRowItReadWhileAnotherChangesOrRemovesIt) {
+  Table a(nullptr, "VOVOVA", GetParam(), "A");
+  Table b(nullptr, "VOVOVA", GetParam(), "B");
+  ASSERT_EQ(a.chercher(3, "IDENT", '=', Valeur::chaine("0000000012")), 0);
+  ASSERT_EQ(b.chercher(3, "IDENT", '=', Valeur::chaine("0000000012")), 0);
+  b.ecrire("NOM", Valeur::chaine("changé"));
+  ASSERT_EQ(b.modifier(), 0);
+  EXPECT_EQ(a.valeur("NOM").toChaine(), "n0000000012");
+  // Writing one column writes that one only: the other cursor's change stays.
+  a.ecrire("N", Valeur::entier(99));
+  ASSERT_EQ(a.modifier(), 0);
+  ASSERT_EQ(b.aller(a.courantId()), 0);
+  EXPECT_EQ(b.valeur("NOM").toChaine(), "changé");
+  EXPECT_EQ(b.valeur("N").toChaine(), "99");
+  ASSERT_EQ(b.supprimer(), 0);
+  EXPECT_EQ(a.valeur("NOM").toChaine(), "n0000000012");
+  // A row inserted is the cursor's current row, read back as written.
+  a.preparer();
+  a.ecrire("IDENT", Valeur::chaine("0000000500"));
+  ASSERT_EQ(a.inserer(), 0);
+  a.ecrire("N", Valeur::entier(5));
+  ASSERT_EQ(a.modifier(), 0);
+  ASSERT_EQ(b.chercher(3, "IDENT", '=', Valeur::chaine("0000000500")), 0);
+  EXPECT_EQ(b.valeur("N").toChaine(), "5");
+  EXPECT_EQ(a.valeur("IDENT").toChaine(), "0000000500");
+}
+
 TEST(TableTest, DuplicateKeysAreRefusedAndTransactionsRollBackUnlessCommitted) {
   test::TestSession t;
   Table c(nullptr, "GESCOM", "CHAINAGE", "CTX_CHAINAGE");

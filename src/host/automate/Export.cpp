@@ -15,6 +15,8 @@ bool chiffre(char c) {
 }
 
 int comparerNaturel(const std::string& a, const std::string& b) {
+  // Sorted rows mostly differ in their last sort entries: equal texts are the common case.
+  if (a.size() == b.size() && a.compare(b) == 0) return 0;
   size_t i = 0;
   size_t j = 0;
   while (i < a.size() && j < b.size()) {
@@ -98,23 +100,24 @@ bool Export::ouvrirFichier() {
   }
   bool append = mode_.find('S') == std::string::npos;
   out_ = report::Classeur::ouvrir(file_, format, append);
+  zonesTrouvees_.clear();
   if (mode_.find('I') != std::string::npos) out_->entete(zones_);
   return true;
 }
 
 void Export::pour_tout(Evt*) {
   if (!out_) return;
-  std::vector<Valeur> cells;
-  cells.reserve(zones_.size());
-  Table& t = courant();
-  for (const auto& zone : zones_) {
-    if (Field* f = champ(zone)) {
-      cells.push_back(f->value());
-    } else {
-      cells.push_back(t.valeur(zone));
-    }
+  if (zonesTrouvees_.size() != zones_.size()) {
+    zonesTrouvees_.clear();
+    for (const auto& zone : zones_) zonesTrouvees_.push_back({champ(zone), zone});
   }
-  out_->ligne(cells);
+  // The cells are read where they are, in the fields and in the current row.
+  cellules_.clear();
+  Table& t = courant();
+  for (const auto& zone : zonesTrouvees_) {
+    cellules_.push_back(zone.champ != nullptr ? &zone.champ->value() : &t.valeur(zone.colonne));
+  }
+  out_->ligne(cellules_);
   ++written_;
 }
 

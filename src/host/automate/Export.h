@@ -62,6 +62,13 @@ class Export : public Automate {
   std::vector<std::string> zones_;
   std::unique_ptr<Table> cursor_;
   std::unique_ptr<report::Classeur> out_;
+  // Each zone, found once per export: a field of the automaton, else a column of the table.
+  struct Zone {
+    Field* champ = nullptr;
+    std::string colonne;
+  };
+  std::vector<Zone> zonesTrouvees_;
+  std::vector<const Valeur*> cellules_;
   int64_t written_ = 0;
 };
 

@@ -5,6 +5,52 @@
 
 namespace quarvo::host {
 
+namespace {
+
+// The open selection sorted on rows the store holds in memory, compared where they are instead
+// of copying their sort values; nullopt when the store does not hold them.
+std::optional<std::vector<RowId>> selectionTrieeEnPlace(Table& t,
+                                                        const std::vector<std::string>& colonnes,
+                                                        Comparaison comparer) {
+  TableStore& store = t.store();
+  const TableSchema& schema = store.schema();
+  std::vector<std::pair<std::shared_ptr<const Row>, RowId>> lignes;
+  lignes.reserve(t.tailleSelection());
+  for (size_t i = 0; i < t.tailleSelection(); ++i) {
+    RowId id = t.selectionnee(i);
+    auto row = store.partagee(id);
+    if (!row) {
+      if (i == 0) return std::nullopt;
+      continue;  // gone since the selection was made
+    }
+    lignes.emplace_back(std::move(row), id);
+  }
+  // A column the table does not have reads as an empty value for every row.
+  static const Valeur aucune;
+  std::vector<std::pair<std::optional<size_t>, const Valeur*>> cles;
+  for (const auto& col : colonnes) {
+    auto i = schema.index(col);
+    cles.emplace_back(i, i ? &defautDe(schema.columns()[*i].kind) : &aucune);
+  }
+  auto cellule = [&](const Row& row, size_t k) -> const Valeur& {
+    const auto& [i, defaut] = cles[k];
+    return i && *i < row.values.size() ? row.values[*i] : *defaut;
+  };
+  std::stable_sort(lignes.begin(), lignes.end(), [&](const auto& a, const auto& b) {
+    for (size_t k = 0; k < cles.size(); ++k) {
+      int c = comparer(cellule(*a.first, k), cellule(*b.first, k));
+      if (c != 0) return c < 0;
+    }
+    return false;
+  });
+  std::vector<RowId> order;
+  order.reserve(lignes.size());
+  for (const auto& l : lignes) order.push_back(l.second);
+  return order;
+}
+
+}  // namespace
+
 std::vector<RowId> selectionTriee(Table& t, const std::vector<std::string>& colonnes,
                                   Comparaison comparer) {
   std::vector<RowId> order;
@@ -14,6 +60,7 @@ std::vector<RowId> selectionTriee(Table& t, const std::vector<std::string>& colo
     return order;
   }
   t.ouvrir();
+  if (auto ordre = selectionTrieeEnPlace(t, colonnes, comparer)) return std::move(*ordre);
   std::vector<std::pair<std::vector<Valeur>, RowId>> keyed;
   keyed.reserve(t.tailleSelection());
   while (t.lire(1) == 0) {

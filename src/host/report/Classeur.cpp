@@ -54,16 +54,18 @@ class ClasseurTexte : public Classeur {
     if (appended_) return;  // the existing file has its header already
     std::vector<Valeur> cells;
     for (const auto& n : names) cells.push_back(Valeur::chaine(n));
-    ligne(cells);
+    std::vector<const Valeur*> refs;
+    for (const auto& c : cells) refs.push_back(&c);
+    ligne(refs);
   }
-  void ligne(const std::vector<Valeur>& cells) override {
+  void ligne(const std::vector<const Valeur*>& cells) override {
     // A one-character separator follows the exchange format's quoting rule; a longer one is
     // taken as the column boundary and tabs decide the quoting.
     char sep = format_.separateur.size() == 1 ? format_.separateur[0] : '\t';
     std::string line;
     for (size_t i = 0; i < cells.size(); ++i) {
       if (i > 0) line += format_.separateur;
-      line += celluleTsv(texteCellule(cells[i], format_), sep);
+      line += celluleTsv(texteCellule(*cells[i], format_), sep);
     }
     out_ << line << "\r\n";
   }
@@ -123,11 +125,11 @@ class ClasseurXlsx : public Classeur {
     worksheet_freeze_panes(sheet_, 1, 0);
     ++row_;
   }
-  void ligne(const std::vector<Valeur>& cells) override {
+  void ligne(const std::vector<const Valeur*>& cells) override {
     if (sheet_ == nullptr) return;
     for (size_t c = 0; c < cells.size(); ++c) {
       auto col = static_cast<lxw_col_t>(c);
-      const Valeur& v = cells[c];
+      const Valeur& v = *cells[c];
       switch (v.kind()) {
         case Kind::Monnaie:
           worksheet_write_number(sheet_, row_, col, v.asMonnaie().toDouble(), amount_);

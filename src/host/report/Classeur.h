@@ -33,7 +33,8 @@ class Classeur {
   static bool estXlsx(const std::filesystem::path& file);
 
   virtual void entete(const std::vector<std::string>& names) = 0;
-  virtual void ligne(const std::vector<Valeur>& cells) = 0;
+  // One row of cells; the values are read, not kept.
+  virtual void ligne(const std::vector<const Valeur*>& cells) = 0;
   // Finishes the file; false with the reason in `error` when it could not be written.
   virtual bool fermer(std::string& error) = 0;
 };

@@ -4,7 +4,10 @@
 #include <pango/pangocairo.h>
 
 #include <algorithm>
+#include <cmath>
 #include <map>
+#include <string>
+#include <unordered_map>
 
 #include "host/Texte.h"
 
@@ -51,21 +54,36 @@ void couleur(cairo_t* cr, uint32_t rgb) {
                        (rgb & 0xFF) / 255.0);
 }
 
-// Reusable Pango layouts, one per drawing context, with their fonts cached by style.
+// The Pango layouts of one drawing context, kept by text and style: a report prints the same
+// piece numbers, designations, dates and amounts again and again, and a text laid out once is
+// drawn from its layout every other time. Fonts are cached by style.
 class Mise {
  public:
-  explicit Mise(PangoContext* ctx) : layout_(pango_layout_new(ctx)) {}
+  // Layouts kept at most; past it, the cache starts afresh.
+  static constexpr size_t kRetenues = 4096;
+
+  explicit Mise(PangoContext* ctx) : ctx_(ctx) {}
   ~Mise() {
-    g_object_unref(layout_);
+    vider();
     for (auto& [key, font] : fonts_) pango_font_description_free(font);
   }
   Mise(const Mise&) = delete;
   Mise& operator=(const Mise&) = delete;
 
-  // The layout of `texte` in `largeur` points (wrapped when > 0), 1 unit = 1 point.
+  // The layout of `texte` in `largeur` points (wrapped when > 0), 1 unit = 1 point. It stays
+  // valid until the next call.
   PangoLayout* de(const char* texte, int longueur, double taille, bool gras, bool italique,
                   double largeur, Alignement a) {
     int key = static_cast<int>(taille * 10) * 4 + (gras ? 2 : 0) + (italique ? 1 : 0);
+    cle_.assign(texte, static_cast<size_t>(longueur));
+    cle_ += '\0';
+    cle_ += std::to_string(key) + '|' + std::to_string(std::lround(largeur * 1000)) + '|' +
+            std::to_string(static_cast<int>(a));
+    auto retenue = layouts_.find(cle_);
+    if (retenue != layouts_.end()) return retenue->second;
+    if (layouts_.size() >= kRetenues) vider();
+    PangoLayout* layout = pango_layout_new(ctx_);
+    layouts_.emplace(cle_, layout);
     auto it = fonts_.find(key);
     if (it == fonts_.end()) {
       PangoFontDescription* font = pango_font_description_from_string(kPolice);
@@ -74,18 +92,25 @@ class Mise {
       pango_font_description_set_style(font, italique ? PANGO_STYLE_ITALIC : PANGO_STYLE_NORMAL);
       it = fonts_.emplace(key, font).first;
     }
-    pango_layout_set_font_description(layout_, it->second);
-    pango_layout_set_width(layout_, largeur > 0 ? static_cast<int>(largeur * PANGO_SCALE) : -1);
-    pango_layout_set_wrap(layout_, PANGO_WRAP_WORD_CHAR);
-    pango_layout_set_alignment(layout_, a == Alignement::Droite   ? PANGO_ALIGN_RIGHT
-                                        : a == Alignement::Centre ? PANGO_ALIGN_CENTER
-                                                                  : PANGO_ALIGN_LEFT);
-    pango_layout_set_text(layout_, texte, longueur);
-    return layout_;
+    pango_layout_set_font_description(layout, it->second);
+    pango_layout_set_width(layout, largeur > 0 ? static_cast<int>(largeur * PANGO_SCALE) : -1);
+    pango_layout_set_wrap(layout, PANGO_WRAP_WORD_CHAR);
+    pango_layout_set_alignment(layout, a == Alignement::Droite   ? PANGO_ALIGN_RIGHT
+                                       : a == Alignement::Centre ? PANGO_ALIGN_CENTER
+                                                                 : PANGO_ALIGN_LEFT);
+    pango_layout_set_text(layout, texte, longueur);
+    return layout;
   }
 
  private:
-  PangoLayout* layout_;
+  void vider() {
+    for (auto& [cle, layout] : layouts_) g_object_unref(layout);
+    layouts_.clear();
+  }
+
+  PangoContext* ctx_;
+  std::string cle_;
+  std::unordered_map<std::string, PangoLayout*> layouts_;
   std::map<int, PangoFontDescription*> fonts_;
 };
 

@@ -14,6 +14,11 @@
 // prefix ("LST_" for the first): "<prefix>DEBUT<n>" before the heading bands of level n,
 // "<prefix>CORPS_IMPRIME" before the body bands of each row, "<prefix>FIN<n>_IMPRIME" before
 // the closing bands of level n (the cursor then stands on the group's last row).
+//
+// A part without body bands whose break columns lead its sort order prints only group totals:
+// the engine gathers them in one pass over the table, in the table's order, instead of sorting
+// it; the headings and totals print as the sorted walk would print them (on the group's first
+// and last rows in that order), and no body label is raised.
 #pragma once
 
 #include <map>

@@ -168,6 +168,11 @@ class Impression {
     }
 
     t->effacerCriteres();
+    if (totauxSeuls(p)) {
+      imprimerTotaux(p, *t, sommees);
+      table_ = nullptr;
+      return;
+    }
     std::vector<RowId> order = selectionTriee(*t, p.tri, comparerTri);
 
     size_t levels = p.niveaux.size();
@@ -225,6 +230,114 @@ class Impression {
     }
     for (const auto& b : p.total) bande(b, &totalPartie);
     table_ = nullptr;
+  }
+
+  // A part that prints no row, only the totals of its groups, whose break columns lead its
+  // sort order.
+  static bool totauxSeuls(const Partie& p) {
+    if (!p.corps.empty() || p.niveaux.empty() || p.tri.size() < p.niveaux.size()) return false;
+    for (size_t n = 0; n < p.niveaux.size(); ++n) {
+      if (p.niveaux[n].rupture != p.tri[n]) return false;
+    }
+    return true;
+  }
+
+  // One group of the deepest level: its sums, and its first and last rows in the part's order.
+  struct Groupe {
+    Sommes sommes;
+    std::vector<Valeur> premierTri;
+    std::vector<Valeur> dernierTri;
+    RowId premier = 0;
+    RowId dernier = 0;
+  };
+
+  struct AvantTri {
+    bool operator()(const std::vector<Valeur>& a, const std::vector<Valeur>& b) const {
+      return comparer(a, b) < 0;
+    }
+    static int comparer(const std::vector<Valeur>& a, const std::vector<Valeur>& b) {
+      for (size_t i = 0; i < a.size() && i < b.size(); ++i) {
+        int c = comparerTri(a[i], b[i]);
+        if (c != 0) return c;
+      }
+      return 0;
+    }
+  };
+
+  // Prints a part of totals only as the walk of its sorted rows would: one pass over the table,
+  // in the table's order, gathers each group's sums and its first and last rows (ties in the
+  // table's order, as the sort keeps them); the groups then print in order, each heading on
+  // its first row and each total on its last. No row is copied and nothing is sorted but the
+  // groups. The body label is not raised: there is no body.
+  void imprimerTotaux(const Partie& p, Table& t, const std::set<std::string>& sommees) {
+    const size_t levels = p.niveaux.size();
+    std::map<std::vector<Valeur>, Groupe, AvantTri> groupesTries;
+    t.ouvrir();
+    while (t.lire(1) == 0) {
+      std::vector<Valeur> cle;
+      for (size_t n = 0; n < levels; ++n) cle.push_back(t.valeur(p.tri[n]));
+      std::vector<Valeur> reste;
+      for (size_t k = levels; k < p.tri.size(); ++k) reste.push_back(t.valeur(p.tri[k]));
+      auto [it, nouveau] = groupesTries.try_emplace(std::move(cle));
+      Groupe& g = it->second;
+      if (nouveau || AvantTri::comparer(reste, g.premierTri) < 0) {
+        g.premier = t.courantId();
+        g.premierTri = reste;
+      }
+      if (nouveau || AvantTri::comparer(reste, g.dernierTri) >= 0) {
+        g.dernier = t.courantId();
+        g.dernierTri = std::move(reste);
+      }
+      for (const auto& col : sommees) g.sommes[col] += toMonnaie(t.valeur(col));
+    }
+
+    std::vector<Sommes> groupes(levels);
+    Sommes totalPartie;
+    std::vector<std::string> courants(levels);
+    const Groupe* precedent = nullptr;
+    auto fermer = [&](size_t from) {
+      for (size_t n = levels; n-- > from;) {
+        lever(p.prefixe + "FIN" + std::to_string(n + 1) + "_IMPRIME");
+        for (const auto& b : p.niveaux[n].fin) bande(b, &groupes[n]);
+      }
+    };
+    for (const auto& [cle, g] : groupesTries) {
+      size_t change = levels;
+      for (size_t n = 0; n < levels; ++n) {
+        if (!precedent || cle[n].toChaine() != courants[n]) {
+          change = n;
+          break;
+        }
+      }
+      if (precedent && change < levels) {
+        t.aller(precedent->dernier);
+        fermer(change);
+      }
+      t.aller(g.premier);
+      size_t first = precedent ? change : 0;
+      for (size_t n = first; n < levels; ++n) {
+        if (!p.niveaux[n].saut.empty() && condition(p.niveaux[n].saut)) {
+          doc_.nouvellePage();
+          break;
+        }
+      }
+      for (size_t n = first; n < levels; ++n) {
+        courants[n] = cle[n].toChaine();
+        groupes[n].clear();
+        lever(p.prefixe + "DEBUT" + std::to_string(n + 1));
+        for (const auto& b : p.niveaux[n].debut) bande(b, nullptr);
+      }
+      for (const auto& [col, m] : g.sommes) {
+        totalPartie[col] += m;
+        for (auto& s : groupes) s[col] += m;
+      }
+      precedent = &g;
+    }
+    if (precedent) {
+      t.aller(precedent->dernier);
+      fermer(0);
+    }
+    for (const auto& b : p.total) bande(b, &totalPartie);
   }
 
   Automate& a_;

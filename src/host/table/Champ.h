@@ -16,7 +16,8 @@ class Champ {
 
   const std::string& name() const { return column_; }
   Table& table() { return table_; }
-  Valeur valeur() const { return table_.valeur(column_); }
+  // Valid until the cursor moves or is written to.
+  const Valeur& valeur() const { return table_.valeur(column_); }
   bool set(const Valeur& v) { return table_.ecrire(column_, v); }
   bool set(const std::string& text) { return set(Valeur::chaine(text)); }
   bool set(const char* text) { return set(Valeur::chaine(text)); }

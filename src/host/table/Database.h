@@ -3,7 +3,8 @@
 // Base names are namespaces of the suite; table names are unique across bases, so one database
 // holds them all and one transaction covers pieces, budget lines and links together. The
 // database owns the stores of its tables; cursors borrow them. Transactions nest: an inner
-// Transaction is a savepoint of the outer one.
+// Transaction is a savepoint of the outer one. A Lecture reads one moment without stopping
+// other writers; a join (see Jointure.h) is run by the database in one statement.
 #pragma once
 
 #include <chrono>
@@ -13,6 +14,7 @@
 #include <string>
 #include <vector>
 
+#include "host/table/Jointure.h"
 #include "host/table/Store.h"
 
 namespace quarvo::host {
@@ -31,6 +33,34 @@ class Database {
   virtual void commit() = 0;
   virtual void rollback() = 0;
   virtual int depth() const = 0;
+
+  // A read of one moment (prefer the RAII Lecture below). From its first read to
+  // finirLecture, every read sees the database as it was then, whatever other connections
+  // commit meanwhile, and it takes no lock that would make them wait. Inside a transaction it
+  // is part of that transaction. REQUIRES: nothing written until finirLecture (a transaction
+  // begun inside a read that is not part of one is a runtime fault).
+  virtual void commencerLecture() = 0;
+  virtual void finirLecture() = 0;
+  // Runs a join (see Jointure.h). Throws UException for an unknown table or column.
+  virtual std::unique_ptr<CurseurJoint> joindre(const Jointure& jointure) = 0;
+};
+
+// Begins a read of one moment in its constructor and ends it in its destructor.
+class Lecture {
+ public:
+  explicit Lecture(Database& db) : db_(db) { db_.commencerLecture(); }
+  ~Lecture() {
+    try {
+      db_.finirLecture();
+    } catch (...) {
+      // Nothing was written: the connection drops the read itself on its next statement.
+    }
+  }
+  Lecture(const Lecture&) = delete;
+  Lecture& operator=(const Lecture&) = delete;
+
+ private:
+  Database& db_;
 };
 
 // Begins in its constructor, rolls back in its destructor unless commit() ran.

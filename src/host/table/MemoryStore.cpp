@@ -84,19 +84,19 @@ std::vector<RowId> MemoryStore::select(const std::vector<Criterion>& criteria) {
     auto to = indexed->op == '=' ? index_.upper_bound(text) : index_.end();
     for (auto it = from; it != to; ++it) {
       if (indexed->op == '/' && it->first.compare(0, text.size(), text) != 0) break;
-      if (rowMatches(rows_.at(it->second), criteria)) ids.push_back(it->second);
+      if (rowMatches(*rows_.at(it->second), criteria)) ids.push_back(it->second);
     }
     std::sort(ids.begin(), ids.end());
   } else {
     for (const auto& [id, row] : rows_) {
-      if (rowMatches(row, criteria)) ids.push_back(id);
+      if (rowMatches(*row, criteria)) ids.push_back(id);
     }
   }
   const auto& key = schema_.key();
   if (!key.empty()) {
     std::stable_sort(ids.begin(), ids.end(), [&](RowId a, RowId b) {
-      const Row& ra = rows_.at(a);
-      const Row& rb = rows_.at(b);
+      const Row& ra = *rows_.at(a);
+      const Row& rb = *rows_.at(b);
       for (size_t k : key) {
         int c = Valeur::compare(cell(ra, k), cell(rb, k));
         if (c != 0) return c < 0;
@@ -110,41 +110,67 @@ std::vector<RowId> MemoryStore::select(const std::vector<Criterion>& criteria) {
 bool MemoryStore::fetch(RowId id, Row& out) {
   auto it = rows_.find(id);
   if (it == rows_.end()) return false;
-  out = it->second;
+  const Row& row = *it->second;
+  out = row;
   out.values.resize(schema_.columns().size());
-  for (size_t i = it->second.values.size(); i < out.values.size(); ++i) {
+  for (size_t i = row.values.size(); i < out.values.size(); ++i) {
     out.values[i] = defaultOf(schema_.columns()[i].kind);
   }
   return true;
 }
 
+std::shared_ptr<const Row> MemoryStore::partagee(RowId id) {
+  auto it = rows_.find(id);
+  if (it == rows_.end()) return nullptr;
+  return it->second;
+}
+
+Row& MemoryStore::modifiable(std::shared_ptr<Row>& row) {
+  if (row.use_count() > 1) row = std::make_shared<Row>(*row);
+  return *row;
+}
+
 RowId MemoryStore::insert(const Row& row) {
   RowId id = next_++;
-  rows_.emplace(id, row);
+  rows_.emplace(id, std::make_shared<Row>(row));
   indexAdd(id, row);
   return id;
 }
 
-void MemoryStore::update(RowId id, const Row& row, const std::vector<bool>&) {
+RowId MemoryStore::adopt(Row&& row) {
+  RowId id = next_++;
+  const Row& stored = *rows_.emplace(id, std::make_shared<Row>(std::move(row))).first->second;
+  indexAdd(id, stored);
+  return id;
+}
+
+void MemoryStore::update(RowId id, const Row& row, const std::vector<bool>& changees) {
   auto it = rows_.find(id);
   if (it == rows_.end()) return;
-  indexRemove(id, it->second);
-  it->second = row;
-  indexAdd(id, row);
+  indexRemove(id, *it->second);
+  Row& stored = modifiable(it->second);
+  if (!changees.empty() && stored.values.size() == row.values.size()) {
+    for (size_t i = 0; i < changees.size() && i < row.values.size(); ++i) {
+      if (changees[i]) stored.values[i] = row.values[i];
+    }
+  } else {
+    stored = row;
+  }
+  indexAdd(id, stored);
 }
 
 void MemoryStore::remove(RowId id) {
   auto it = rows_.find(id);
   if (it == rows_.end()) return;
-  indexRemove(id, it->second);
+  indexRemove(id, *it->second);
   rows_.erase(it);
 }
 
 int64_t MemoryStore::removeAll(const std::vector<Criterion>& criteria) {
   int64_t n = 0;
   for (auto it = rows_.begin(); it != rows_.end();) {
-    if (rowMatches(it->second, criteria)) {
-      indexRemove(it->first, it->second);
+    if (rowMatches(*it->second, criteria)) {
+      indexRemove(it->first, *it->second);
       it = rows_.erase(it);
       ++n;
     } else {
@@ -156,7 +182,7 @@ int64_t MemoryStore::removeAll(const std::vector<Criterion>& criteria) {
 
 int64_t MemoryStore::count(const std::vector<Criterion>& criteria) {
   int64_t n = 0;
-  for (const auto& [id, row] : rows_) n += rowMatches(row, criteria) ? 1 : 0;
+  for (const auto& [id, row] : rows_) n += rowMatches(*row, criteria) ? 1 : 0;
   return n;
 }
 
@@ -165,14 +191,14 @@ void MemoryStore::setKey(const std::vector<std::string>& columns) {
   for (const auto& c : columns) key.push_back(schema_.add({c, ColKind::Text}));
   schema_.setKey(std::move(key));
   index_.clear();
-  for (const auto& [id, row] : rows_) indexAdd(id, row);
+  for (const auto& [id, row] : rows_) indexAdd(id, *row);
 }
 
 // Interface records are written in place through this row; they carry no key, so no index
 // needs to follow.
 Row& MemoryStore::firstRow() {
   if (rows_.empty()) insert(Row{});
-  Row& row = rows_.begin()->second;
+  Row& row = modifiable(rows_.begin()->second);
   if (row.values.size() < schema_.columns().size()) {
     size_t from = row.values.size();
     row.values.resize(schema_.columns().size());

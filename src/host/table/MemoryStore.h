@@ -1,9 +1,10 @@
 // A memory table of the session ("M_...", "MEM:...", interface records "I_...").
 //
 // Same contract as a persistent table: selections in key order (the declared key columns, else
-// insertion order), fetch, insert, update, delete. Columns are added on first write, typed by
-// the value written, unless the table was created with the layout of a persistent table. The
-// session owns memory tables and shares them by name between its automata.
+// insertion order), fetch, insert, update, delete. Its rows are shared with the cursors that
+// read them (see TableStore::partagee) and copied only when changed while shared. Columns are added
+// on first write, typed by the value written, unless the table was created with the layout of a
+// persistent table. The session owns memory tables and shares them by name between its automata.
 #pragma once
 
 #include <map>
@@ -27,7 +28,9 @@ class MemoryStore : public TableStore {
   bool extensible() const override { return true; }
   std::vector<RowId> select(const std::vector<Criterion>& criteria) override;
   bool fetch(RowId id, Row& out) override;
+  std::shared_ptr<const Row> partagee(RowId id) override;
   RowId insert(const Row& row) override;
+  RowId adopt(Row&& row) override;
   void update(RowId id, const Row& row, const std::vector<bool>& changees) override;
   void remove(RowId id) override;
   int64_t removeAll(const std::vector<Criterion>& criteria) override;
@@ -60,7 +63,10 @@ class MemoryStore : public TableStore {
   void indexRemove(RowId id, const Row& row);
   std::string indexText(const Row& row) const;
 
-  std::map<RowId, Row> rows_;
+  // A row to change: copied first when a cursor still reads it.
+  Row& modifiable(std::shared_ptr<Row>& row);
+
+  std::map<RowId, std::shared_ptr<Row>> rows_;
   std::multimap<std::string, RowId> index_;
   RowId next_ = 1;
 };

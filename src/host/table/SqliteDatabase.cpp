@@ -8,6 +8,7 @@
 
 #include "host/UException.h"
 #include "host/table/CheckpointEnFond.h"
+#include "host/table/SqliteJointure.h"
 #include "host/table/SqliteSchema.h"
 #include "host/table/SqliteStatements.h"
 #include "host/table/SqliteStore.h"
@@ -210,20 +211,77 @@ void SqliteDatabase::executer(const std::string& sql) {
   }
 }
 
+void SqliteDatabase::verifierVersion() {
+  // What was remembered from earlier transactions holds unless another connection has
+  // committed since: SQLite's data version changes exactly then.
+  sqlite3_stmt* st = prepare("PRAGMA data_version");
+  Reset reset{st};
+  int64_t version = sqlite3_step(st) == SQLITE_ROW ? sqlite3_column_int64(st, 0) : -1;
+  if (version != dataVersion_ || version < 0) {
+    oublierLectures();
+    verifierSchema();
+  }
+  dataVersion_ = version;
+}
+
+void SqliteDatabase::commencerLecture() {
+  if (depth_ > 0) {
+    lectures_.push_back(false);
+    return;
+  }
+  executer("BEGIN DEFERRED");
+  try {
+    // The first read takes the snapshot; in WAL mode it holds no lock a writer waits on.
+    sqlite3_stmt* st = prepare("SELECT 1 FROM sqlite_schema LIMIT 1");
+    Reset reset{st};
+    int rc = sqlite3_step(st);
+    if (rc != SQLITE_ROW && rc != SQLITE_DONE) fail("read of one moment");
+    verifierVersion();
+  } catch (...) {
+    sqlite3_exec(db_.get(), "ROLLBACK", nullptr, nullptr, nullptr);
+    throw;
+  }
+  depth_ = 1;
+  lectures_.push_back(true);
+}
+
+void SqliteDatabase::finirLecture() {
+  if (lectures_.empty()) throw UException("end of a read that was not begun");
+  bool ouverte = lectures_.back();
+  lectures_.pop_back();
+  if (ouverte) commit();
+}
+
+std::unique_ptr<CurseurJoint> SqliteDatabase::joindre(const Jointure& jointure) {
+  RequeteJointe requete =
+      construireJointure(jointure, [this](const std::string& table) -> SqliteStore* {
+        return static_cast<SqliteStore*>(store(table));
+      });
+  ecrireEnAttente();  // the file must hold what the join reads
+  sqlite3_stmt* st = prepare(requete.sql);
+  std::unique_ptr<sqlite3_stmt, Finaliser> propre;
+  if (jointuresEnCours_.count(st) > 0) {
+    // The same join is being read by another cursor: this one reads its own statement.
+    sqlite3_stmt* brut = nullptr;
+    if (sqlite3_prepare_v2(db_.get(), requete.sql.c_str(), -1, &brut, nullptr) != SQLITE_OK) {
+      fail("prepare " + requete.sql);
+    }
+    propre.reset(brut);
+    st = brut;
+  }
+  return std::make_unique<SqliteCurseurJoint>(*statements_, std::move(requete), st,
+                                              std::move(propre), jointuresEnCours_);
+}
+
 void SqliteDatabase::begin() {
+  if (!lectures_.empty() && lectures_.front()) {
+    // Its writes would wait for the read to end, and fail if another connection wrote since.
+    throw UException("a transaction inside a read of one moment");
+  }
   ecrireEnAttente();  // what waits belongs to the enclosing level
   if (depth_ == 0) {
     executer("BEGIN IMMEDIATE");
-    // What was remembered from earlier transactions holds unless another connection has
-    // committed since: SQLite's data version changes exactly then.
-    sqlite3_stmt* st = prepare("PRAGMA data_version");
-    Reset reset{st};
-    int64_t version = sqlite3_step(st) == SQLITE_ROW ? sqlite3_column_int64(st, 0) : -1;
-    if (version != dataVersion_ || version < 0) {
-      oublierLectures();
-      verifierSchema();
-    }
-    dataVersion_ = version;
+    verifierVersion();
   } else {
     pas("SAVEPOINT sp" + std::to_string(depth_));
   }

@@ -28,6 +28,7 @@
 #include <chrono>
 #include <cstdint>
 #include <memory>
+#include <set>
 #include <unordered_map>
 #include <utility>
 
@@ -66,6 +67,11 @@ class SqliteDatabase : public Database {
   void commit() override;
   void rollback() override;
   int depth() const override { return depth_; }
+  // A deferred transaction whose first read fixes the snapshot of the write-ahead log it
+  // reads: other connections go on writing; it sees none of what they commit.
+  void commencerLecture() override;
+  void finirLecture() override;
+  std::unique_ptr<CurseurJoint> joindre(const Jointure& jointure) override;
   // How long a statement waits for another connection's lock before it fails (30 s unless set).
   void delaiAttente(std::chrono::milliseconds delai);
 
@@ -112,6 +118,9 @@ class SqliteDatabase : public Database {
   // After a script, or when another connection committed: when the schema changed, every
   // store learns its table's indexes and triggers again.
   void verifierSchema();
+  // At the start of a transaction: forgets what was remembered when another connection
+  // committed since the last one.
+  void verifierVersion();
   static int surCommit(void* self, sqlite3* db, const char* base, int pages);
 
   std::filesystem::path path_;
@@ -126,6 +135,9 @@ class SqliteDatabase : public Database {
   std::pair<int64_t, int64_t> versionSchema_{-1, -1};  // what the stores were described from
   std::unordered_map<std::string, std::unique_ptr<SqliteStore>> stores_;
   std::vector<SqliteStore*> enAttente_;  // stores holding updates not yet written
+  // Per read of one moment begun, whether it opened the transaction (else it is part of one).
+  std::vector<bool> lectures_;
+  std::set<sqlite3_stmt*> jointuresEnCours_;  // cached join statements cursors are reading
 };
 
 }  // namespace quarvo::host

@@ -351,37 +351,40 @@ void SqliteStore::step(sqlite3_stmt* st, const char* what) {
   statements_.fail(quoi);
 }
 
+std::string sqlCritere(const ColumnInfo& col, const std::string& prefixe, const Criterion& c,
+                       std::vector<Valeur>& binds) {
+  std::string q = prefixe + sqlIdent(col.name);
+  if (c.op == '/') {
+    // "Starts with" as a range, so that an index on the column serves it: every text that
+    // starts with the prefix sorts between the prefix and the prefix followed by the highest
+    // character (texts compare bytewise, and valid UTF-8 has no byte above F4).
+    std::string prefix = c.value.toChaine();
+    binds.push_back(Valeur::chaine(prefix));
+    binds.push_back(Valeur::chaine(prefix + "\xF4\x8F\xBF\xBF"));
+    return q + " >= ? AND " + q + " < ?";
+  }
+  const char* cmp = c.op == '+' ? " >= ?" : c.op == '-' ? " <= ?" : " = ?";
+  auto fitted = fitColumn(col, c.value);
+  if (col.kind == ColKind::Decimal && c.op != '=') {
+    binds.push_back(Valeur::dbl(fitted ? fitted->asMonnaie().toDouble() : 0.0));
+    return "CAST(" + q + " AS REAL)" + cmp;
+  }
+  if (col.kind == ColKind::Date) {
+    binds.push_back(Valeur::chaine(fitted ? fitted->asDate().iso() : c.value.toChaine()));
+    return "COALESCE(" + q + ", '')" + cmp;
+  }
+  binds.push_back(fitted ? storageForm(col.kind, *fitted) : c.value);
+  return q + cmp;
+}
+
 std::string SqliteStore::where(const std::vector<Criterion>& criteria, std::vector<Valeur>& binds) {
   const TableSchema& schema = description_.schema;
   std::string sql;
   for (const auto& c : criteria) {
     auto i = schema.index(c.column);
     if (!i) throw UException("table " + name_ + " has no column " + c.column);
-    const ColumnInfo& col = schema.columns()[*i];
     sql += sql.empty() ? " WHERE " : " AND ";
-    std::string q = sqlIdent(col.name);
-    if (c.op == '/') {
-      // "Starts with" as a range, so that an index on the column serves it: every text that
-      // starts with the prefix sorts between the prefix and the prefix followed by the highest
-      // character (texts compare bytewise, and valid UTF-8 has no byte above F4).
-      std::string prefix = c.value.toChaine();
-      sql += q + " >= ? AND " + q + " < ?";
-      binds.push_back(Valeur::chaine(prefix));
-      binds.push_back(Valeur::chaine(prefix + "\xF4\x8F\xBF\xBF"));
-      continue;
-    }
-    const char* cmp = c.op == '+' ? " >= ?" : c.op == '-' ? " <= ?" : " = ?";
-    auto fitted = fitColumn(col, c.value);
-    if (col.kind == ColKind::Decimal && c.op != '=') {
-      sql += "CAST(" + q + " AS REAL)" + cmp;
-      binds.push_back(Valeur::dbl(fitted ? fitted->asMonnaie().toDouble() : 0.0));
-    } else if (col.kind == ColKind::Date) {
-      sql += "COALESCE(" + q + ", '')" + cmp;
-      binds.push_back(Valeur::chaine(fitted ? fitted->asDate().iso() : c.value.toChaine()));
-    } else {
-      sql += q + cmp;
-      binds.push_back(fitted ? storageForm(col.kind, *fitted) : c.value);
-    }
+    sql += sqlCritere(schema.columns()[*i], "", c, binds);
   }
   return sql;
 }

@@ -20,6 +20,11 @@ namespace quarvo::host {
 
 class SqliteDatabase;
 
+// The SQL of criterion `c` on column `col` of the table written `prefixe` ("" or "t1."), its
+// values added to `binds`: as every selection of the store writes it.
+std::string sqlCritere(const ColumnInfo& col, const std::string& prefixe, const Criterion& c,
+                       std::vector<Valeur>& binds);
+
 class SqliteStore : public TableStore {
  public:
   SqliteStore(SqliteDatabase& db, SqliteStatements& statements, std::string name,

@@ -94,6 +94,18 @@ Valeur defaultOf(ColKind k) {
   }
 }
 
+const Valeur& defautDe(ColKind k) {
+  static const std::vector<Valeur> defauts = [] {
+    std::vector<Valeur> v;
+    for (ColKind kind : {ColKind::Text, ColKind::Integer, ColKind::Real, ColKind::Decimal,
+                         ColKind::Date, ColKind::Time, ColKind::DecimalList, ColKind::DateList}) {
+      v.push_back(defaultOf(kind));
+    }
+    return v;
+  }();
+  return defauts[static_cast<size_t>(k)];
+}
+
 std::optional<Valeur> fitColumn(const ColumnInfo& col, const Valeur& v) {
   return v.convertTo(valueKindOf(col.kind));
 }

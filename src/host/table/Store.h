@@ -90,14 +90,19 @@ class TableStore {
     return std::nullopt;
   }
   virtual bool fetch(RowId id, Row& out) = 0;
-  // The row `id` shared with what the store remembers instead of copied, or null when the store
-  // remembers no such row (the caller then fetches a copy). A shared row never changes under
-  // its holder: the store changes a copy of it.
+  // A row the store holds in memory (a memory table's, or a row a persistent table remembers
+  // inside a transaction), to be read where it is instead of copied: it stays as it was when
+  // asked, whatever is written or removed after (the store copies a row still shared before
+  // changing it). It may hold fewer values than the schema has columns: the missing ones are
+  // their kinds' defaults. Null when the store holds no such row (the caller fetches a copy).
   virtual std::shared_ptr<const Row> partagee(RowId id) {
     (void)id;
     return nullptr;
   }
   virtual RowId insert(const Row& row) = 0;
+  // Inserts `row`, whose values a store that holds its rows in memory takes instead of copying
+  // them (`row` is then left empty and `partagee` gives the row); others copy them.
+  virtual RowId adopt(Row&& row) { return insert(row); }
   // Writes the columns flagged in `changees` (those the caller changed since it read the row);
   // an empty mask writes every column.
   virtual void update(RowId id, const Row& row, const std::vector<bool>& changees) = 0;
@@ -110,5 +115,7 @@ class TableStore {
 std::optional<Valeur> fitColumn(const ColumnInfo& col, const Valeur& v);
 // The default value of a column kind (empty text, 0, empty date, 0.00).
 Valeur defaultOf(ColKind k);
+// The same, one value per kind for the life of the program.
+const Valeur& defautDe(ColKind k);
 
 }  // namespace quarvo::host

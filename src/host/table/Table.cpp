@@ -78,17 +78,26 @@ void Table::load(RowId id) {
   if (!store().fetch(id, buffer_)) current_ = 0;
 }
 
-Row& Table::ecrivable() {
-  if (partagee_) {
-    buffer_ = *partagee_;
-    partagee_.reset();
+void Table::detacher() {
+  if (!partagee_) return;
+  buffer_ = *partagee_;
+  partagee_.reset();
+  const auto& cols = store().schema().columns();
+  for (size_t i = buffer_.values.size(); i < cols.size(); ++i) {
+    buffer_.values.push_back(defaultOf(cols[i].kind));
   }
-  return buffer_;
 }
 
 int Table::aller(RowId id) {
   load(id);
   return current_ != 0 ? 0 : 1;
+}
+
+void Table::poserLigne(RowId id, Row&& row) {
+  partagee_.reset();
+  current_ = id;
+  changees_.clear();
+  buffer_ = std::move(row);
 }
 
 int Table::lire(int mode, char) {
@@ -124,8 +133,8 @@ int Table::chercher(int mode, const std::string& column, char op, const Valeur& 
 }
 
 void Table::preparer() {
-  current_ = 0;
   partagee_.reset();
+  current_ = 0;
   const auto& cols = store().schema().columns();
   buffer_.values.clear();
   buffer_.nulles.clear();
@@ -135,9 +144,12 @@ void Table::preparer() {
 
 int Table::inserer() {
   if (isRecord_) return 1;
+  detacher();
   try {
-    current_ = store().insert(ligne());
+    current_ = store().adopt(std::move(buffer_));
     changees_.clear();
+    // A memory table took the buffer: its row is read where it is from now on.
+    partagee_ = store().partagee(current_);
   } catch (const ConstraintError&) {
     return 1;
   }
@@ -147,6 +159,7 @@ int Table::inserer() {
 int Table::modifier() {
   if (isRecord_) return 0;
   if (current_ == 0) return 1;
+  if (partagee_) return 0;  // nothing written since the row was read
   try {
     // A full-width mask: an empty one would mean every column.
     changees_.resize(store().schema().columns().size(), false);
@@ -183,31 +196,45 @@ int64_t Table::compter() {
 
 const Row& Table::ligne() {
   if (isRecord_) return static_cast<MemoryStore&>(store()).firstRow();
-  return partagee_ ? *partagee_ : buffer_;
+  detacher();  // whole, as the schema has it
+  return buffer_;
 }
 
-Valeur Table::valeur(std::string_view column) {
+const Valeur& Table::valeur(std::string_view column) {
+  static const Valeur aucune;
   TableStore& s = store();
   auto i = s.schema().index(column);
   if (!i) {
-    if (s.extensible()) return Valeur();
+    if (s.extensible()) return aucune;
     throw UException("table " + name_ + " has no column " + std::string(column));
   }
-  const Row& row = ligne();
+  const Row& row = isRecord_   ? static_cast<MemoryStore&>(s).firstRow()
+                   : partagee_ ? *partagee_
+                               : buffer_;
   if (*i < row.values.size()) return row.values[*i];
-  return defaultOf(s.schema().columns()[*i].kind);
+  return defautDe(s.schema().columns()[*i].kind);
 }
 
 bool Table::ecrire(std::string_view column, const Valeur& value) {
+  Valeur copie = value;
+  return ecrire(column, std::move(copie));
+}
+
+bool Table::ecrire(std::string_view column, Valeur&& value) {
   TableStore& s = store();
   auto i = s.schema().index(column);
   if (!i) {
     if (!s.extensible()) return false;
     i = s.schema().add({std::string(column), colKindOfValue(value.kind())});
   }
-  auto fitted = fitColumn(s.schema().columns()[*i], value);
-  if (!fitted) return false;
-  Row& row = isRecord_ ? static_cast<MemoryStore&>(s).firstRow() : ecrivable();
+  const ColumnInfo& col = s.schema().columns()[*i];
+  if (value.kind() != valueKindOf(col.kind)) {
+    auto fitted = fitColumn(col, value);
+    if (!fitted) return false;
+    value = std::move(*fitted);
+  }
+  detacher();
+  Row& row = isRecord_ ? static_cast<MemoryStore&>(s).firstRow() : buffer_;
   if (row.values.size() <= *i) {
     size_t from = row.values.size();
     row.values.resize(s.schema().columns().size());
@@ -218,8 +245,8 @@ bool Table::ecrire(std::string_view column, const Valeur& value) {
   // Only a column whose stored value changes is written: the store then maintains only the
   // indexes, and fires only the triggers, of what really changed.
   Valeur& cible = row.values[*i];
-  bool change = row.nulle(*i) || cible.kind() != fitted->kind() || !(cible == *fitted);
-  cible = std::move(*fitted);
+  bool change = row.nulle(*i) || cible.kind() != value.kind() || !(cible == value);
+  cible = std::move(value);
   if (!isRecord_ && change) {
     if (changees_.size() <= *i) changees_.resize(s.schema().columns().size(), false);
     changees_[*i] = true;

@@ -68,12 +68,19 @@ class Table {
   // The row id of the current row, and positioning on a row id of this table.
   RowId courantId() const { return current_; }
   int aller(RowId id);
+  // Makes `row`, row `id` of this table read elsewhere (a join's part of it), the current row,
+  // as `aller(id)` would without reading it again.
+  void poserLigne(RowId id, Row&& row);
 
   bool courante() const { return current_ != 0 || isRecord_; }
-  Valeur valeur(std::string_view column);
+  // The value of a column of the current row; it stays valid until the cursor moves or is
+  // written to.
+  const Valeur& valeur(std::string_view column);
   // Writes into the current row buffer, converted to the column's kind; false when it does not
   // convert or the column does not exist.
   bool ecrire(std::string_view column, const Valeur& value);
+  // The same, taking the value when it is already of the column's kind.
+  bool ecrire(std::string_view column, Valeur&& value);
   const Row& ligne();
 
   TableStore& store();
@@ -83,8 +90,8 @@ class Table {
  private:
   Session& session();
   void load(RowId id);
-  // The current row, to be written: the shared row copied into the buffer first.
-  Row& ecrivable();
+  // Makes the row read in place the cursor's own buffer, before a write.
+  void detacher();
 
   Automate* owner_;
   std::string base_;
@@ -98,8 +105,9 @@ class Table {
   size_t position_ = 0;  // next index of the selection for mode 1
   RowId current_ = 0;
   Row buffer_;
-  std::shared_ptr<const Row> partagee_;  // the current row as the store remembers it, unwritten
-  std::vector<bool> changees_;           // columns written since the row was read or prepared
+  // The current row as the store holds it, read in place (then `buffer_` is not used).
+  std::shared_ptr<const Row> partagee_;
+  std::vector<bool> changees_;  // columns whose value changed since the row was read or prepared
   char lock_ = 0;
 };
 

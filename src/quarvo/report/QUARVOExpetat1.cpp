@@ -24,7 +24,6 @@ QUARVOExpetat1::QUARVOExpetat1(Evt* evt)
       vDisponible_(monnaie("V_DISPONIBLE")),
       vSolde_(monnaie("V_SOLDE")),
       vPrestationEnCours_(chaine("V_PRESTATION_EN_COURS")),
-      iQuarvo_(this, nomBase(), "I_QUARVO", ""),
       iAfaffa_(this, nomBase(), "I_AFAFFA", ""),
       iAfebud_(this, nomBase(), "I_AFEBUD", ""),
       iAflbud_(this, nomBase(), "I_AFLBUD", "") {
@@ -75,11 +74,15 @@ void QUARVOExpetat1::pour_tout(Evt* evt) {
   if (affaire != affaireLue_) affaireLue_ = lire("AFAFFA", affaire) ? affaire : std::string();
   if (budget != budgetLu_) budgetLu_ = lire("AFEBUD", budget) ? budget : std::string();
   if (ligne != ligneLue_) ligneLue_ = lire("AFLBUD", ligne) ? ligne : std::string();
-  std::string composant;
-  if (!lien.empty() && lire("QUARVO", lien)) {
-    composant = iQuarvo_.valeur("COMPOSANT").toChaine();
-    if (!composant.empty()) lire(composant, iQuarvo_.valeur("COMPOSANT_IDENT").toChaine());
-  }
+  // The kind of a piece row is its link's component, which the selection turned into the row's
+  // type: the type gives it back without reading the link again.
+  std::string type = row.valeur("TYPE").toChaine();
+  const char* composant = lien.empty()  ? ""
+                          : type == "2" ? "GAPECOM"
+                          : type == "3" ? "GAPEBL"
+                          : type == "4" ? "GAPEFAC"
+                          : type == "5" ? "AFEFFO"
+                                        : "";
 
   // 2. to 4. Labels.
   vAfaffaDesig_.set(affaireLue_.empty() ? std::string() : iAfaffa_.valeur("DESIG").toChaine());
@@ -97,7 +100,6 @@ void QUARVOExpetat1::pour_tout(Evt* evt) {
                : std::string());
 
   // 5. Kind of row, piece and date.
-  std::string type = row.valeur("TYPE").toChaine();
   vType_.set("0AFEBUD");
   vPiece_.set("");
   vDatePiece_.set(Date());

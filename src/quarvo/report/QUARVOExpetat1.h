@@ -5,8 +5,9 @@
 // Each row carries the project's, budget's and budget line's labels and two running amounts of
 // its budget line: "V_DISPONIBLE" (budget less orders) and "V_SOLDE" (orders less invoices),
 // both restarted at each budget line and never below 0. The file is tab-separated text
-// ("EXCEL1"), or a real workbook when its name ends in ".xlsx". Created with the file name
-// (parameter 0, by value).
+// ("EXCEL1"), or a real workbook when its name ends in ".xlsx". The labels are read once per
+// project, budget and budget line; a piece row's kind is the component its type stands for. Created
+// with the file name (parameter 0, by value).
 #pragma once
 
 #include "host/automate/Export.h"
@@ -41,7 +42,6 @@ class QUARVOExpetat1 : public host::Export {
   host::Field& vSolde_;
   host::Field& vPrestationEnCours_;
 
-  host::Table iQuarvo_;
   host::Table iAfaffa_;
   host::Table iAfebud_;
   host::Table iAflbud_;

@@ -128,7 +128,9 @@ Etat layout() {
 
   // Recapitulation 1: one line per criterion.
   Partie recap1;
-  recap1.table = "M_APPR1A";
+  // The recapitulations read the report table itself: the engine gathers their totals in one
+  // pass over it, without sorting or copying it.
+  recap1.table = "M_APPR1";
   recap1.condition = "VRECAP1";
   recap1.prefixe = "LST_R1_";
   recap1.titre = "'Récapitulatif par ' & VFIN1";
@@ -150,7 +152,6 @@ Etat layout() {
 
   // Recapitulation 2: per criterion, one line per project.
   Partie recap2 = recap1;
-  recap2.table = "M_APPR1C";
   recap2.condition = "VRECAP2";
   recap2.prefixe = "LST_R2_";
   recap2.titre = "'Récapitulatif par ' & VFIN1 & ' et par affaire'";
@@ -223,11 +224,6 @@ QUARVOImpetat1::QUARVOImpetat1(Evt* evt)
 }
 
 void QUARVOImpetat1::init(Evt* evt) {
-  // Each selection prints its own copies; a share code that is no memory-table name is made one.
-  std::string code = codePartage_.text();
-  if (!Session::isMemoryName(code)) code = "M_" + code;
-  mAppr1a_ = std::make_unique<Table>(this, nomBase(), code + "A", "M_APPR1A");
-  mAppr1c_ = std::make_unique<Table>(this, nomBase(), code + "C", "M_APPR1C");
   Edition_etat::init(evt);
   nomEtat("IMPETAT1");
 }
@@ -278,9 +274,6 @@ void QUARVOImpetat1::debut(Evt* evt) {
   std::string options = voptions_.text();
   Field* flags[] = {&vfolio_, &vcorps_, &vcorps2_, &vrecap1_, &vrecap2_};
   for (size_t i = 0; i < 5; ++i) flags[i]->set(int64_t{i < options.size() && options[i] == '1'});
-
-  if (vrecap1_.entier() == 1) dupliquer("M_APPR1", mAppr1a_->name());
-  if (vrecap2_.entier() == 1) dupliquer("M_APPR1", mAppr1c_->name());
 }
 
 std::string QUARVOImpetat1::prefixe() {

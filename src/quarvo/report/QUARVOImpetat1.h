@@ -1,13 +1,11 @@
 // "QUARVO-IMPETAT1": prints the purchase follow-up report from "M_APPR1" on the layout
 // "IMPETAT1": per grouping criterion, per project (a page each when asked), per budget with
 // its origin caption, the budget lines with their pieces, totals per line, budget, project,
-// criterion and overall, then the two recapitulations by criterion (from per-instance copies of
-// "M_APPR1"). Created with the share code, the period, the criterion, the selection summary
-// and the five options "VOPTIONS" (page per project, lines, pieces, recapitulation 1 and 2),
-// all by value.
+// criterion and overall, then the two recapitulations by criterion (totals the engine gathers
+// from "M_APPR1" itself). Created with the share code, the period, the criterion, the selection
+// summary and the five options "VOPTIONS" (page per project, lines, pieces, recapitulation 1 and
+// 2), all by value.
 #pragma once
-
-#include <memory>
 
 #include "host/automate/Edition_etat.h"
 #include "host/table/Champ.h"
@@ -52,8 +50,6 @@ class QUARVOImpetat1 : public host::Edition_etat {
   host::Field& vEdition_;
 
   host::Table mAppr1_;
-  std::unique_ptr<host::Table> mAppr1a_;
-  std::unique_ptr<host::Table> mAppr1c_;
   host::Table iAfvoca_;
   host::Table iAfebud_;
   host::Table iAflbud_;

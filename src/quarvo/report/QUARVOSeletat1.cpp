@@ -60,9 +60,9 @@ QUARVOSeletat1::QUARVOSeletat1(Evt* evt)
       afebud_(this, nomBase(), "AFEBUD", ""),
       aflbud_(this, nomBase(), "AFLBUD", ""),
       quarvo_(this, nomBase(), "QUARVO", ""),
-      iGapecom_(this, "GESCOM", "I_GAPECOM", ""),
-      iGapebl_(this, "GESCOM", "I_GAPEBL", ""),
-      iGapefac_(this, "GESCOM", "I_GAPEFAC", ""),
+      gapecom_(this, "GESCOM", "GAPECOM", "ENTETE"),
+      gapebl_(this, "GESCOM", "GAPEBL", "ENTETE"),
+      gapefac_(this, "GESCOM", "GAPEFAC", "ENTETE"),
       affaCode_("CODE", afaffa_),
       affaIdent_("IDENT", afaffa_),
       affaDesig_("DESIG", afaffa_),
@@ -82,7 +82,6 @@ QUARVOSeletat1::QUARVOSeletat1(Evt* evt)
       lienIdent_("IDENT", quarvo_),
       lienDate_("DATE_PIECE", quarvo_),
       lienComposant_("COMPOSANT", quarvo_),
-      lienComposantIdent_("COMPOSANT_IDENT", quarvo_),
       lienPiece_("PIECE", quarvo_),
       lienHt_("HT", quarvo_) {
   nomBase("VOVOVA");
@@ -255,6 +254,9 @@ void QUARVOSeletat1::validation(Evt* evt) {
     appelerProcedure("*1", "AFSERV", "INTERFACE", "LECTURE_CODE", &serv, -1);
   }
 
+  // Every row of the report is read from one moment, without holding back other writers.
+  lecture_.reset();
+  lecture_.emplace(session().db());
   vvaleur1_.set(0.0);
   afficherJauge(0, 1);
   mAppr1_.effacerCriteres();
@@ -321,39 +323,78 @@ void QUARVOSeletat1::controler_affaire(Evt* evt) {
 }
 
 void QUARVOSeletat1::traiter_table_afebud(Evt*) {
-  afebud_.effacerCriteres();
-  afebud_.ajouterCritere("AFAFFA_IDENT", '=', Valeur::chaine(affaIdent_.text()));
+  // The project's budgets, their lines, the links of each line up to the period's end and the
+  // linked pieces' headers, in one join ordered as the nested selections were: budgets, then
+  // lines, then links, each in key order. The lines of a budget are those whose "NUMERO"
+  // starts with its identifier and "|"; the budget identifier the database derives from
+  // "NUMERO" lets the join use its index.
+  enum { kBudget, kLigne, kLien, kCommande, kReception, kFacture };
+  Jointure j;
+  TableJointe budgets{"AFEBUD", {}, {{"AFAFFA_IDENT", '=', Valeur::chaine(affaIdent_.text())}}};
   if (vaffaChoix_.text() == "B") {
-    afebud_.ajouterCritere("IDENT", '=', Valeur::chaine(vafebudIdent_.text()));
+    budgets.criteres.push_back({"IDENT", '=', Valeur::chaine(vafebudIdent_.text())});
   }
-  afebud_.ajouterCritere("DATE_CREATION", '-', vdatemax_.value(), 'D');
-  afebud_.ouvrir();
-  while (afebud_.lire(1) == 0) {
-    if (appeler("CONTROLER_BUDGET") != 0) continue;
-    aflbud_.effacerCriteres();
-    // The lines of a budget are those whose "NUMERO" starts with its identifier and "|"; the
-    // budget identifier the database derives from "NUMERO" lets the selection use its index.
-    aflbud_.ajouterCritere("AFEBUD_IDENT", '=', Valeur::chaine(budIdent_.text()));
-    aflbud_.ajouterCritere("NUMERO", '/', Valeur::chaine(budIdent_.text() + "|"));
-    aflbud_.ouvrir();
-    while (aflbud_.lire(1) == 0) {
-      if (lbudStyle_.entier() != 0) continue;
-      appeler("CREER_TRI", "0");
-      quarvo_.effacerCriteres();
-      quarvo_.ajouterCritere("AFLBUD_IDENT", '=', Valeur::chaine(lbudIdent_.text()));
-      quarvo_.ajouterCritere("DATE_PIECE", '-', vdatemax_.value(), 'D');
-      quarvo_.verrouiller('E');
-      quarvo_.ouvrir();
-      while (quarvo_.lire(1) == 0) {
-        std::string composant = lienComposant_.text();
-        std::string ptype = composant == "GAPECOM"   ? "2"
-                            : composant == "GAPEBL"  ? "3"
-                            : composant == "GAPEFAC" ? "4"
-                            : composant == "AFEFFO"  ? "5"
-                                                     : "";
-        if (!ptype.empty()) appeler("CREER_TRI", ptype);
+  budgets.criteres.push_back({"DATE_CREATION", '-', vdatemax_.value()});
+  j.tables.push_back(std::move(budgets));
+  j.tables.push_back({"AFLBUD",
+                      {LienJointure::egal("AFEBUD_IDENT", kBudget, "IDENT"),
+                       LienJointure::commencePar("NUMERO", kBudget, "IDENT", "|")},
+                      {},
+                      false});
+  // Of a link and a piece header, only what the rows take.
+  j.tables.push_back({"QUARVO",
+                      {LienJointure::egal("AFLBUD_IDENT", kLigne, "IDENT")},
+                      {{"DATE_PIECE", '-', vdatemax_.value()}},
+                      true,
+                      {"IDENT", "DATE_PIECE", "COMPOSANT", "PIECE", "HT"}});
+  for (const char* entete : {"GAPECOM", "GAPEBL", "GAPEFAC"}) {
+    std::vector<std::string> colonnes{"DESIG", "ORIGINE"};
+    if (std::string(entete) == "GAPEFAC") colonnes.push_back("TYPE");
+    j.tables.push_back({entete,
+                        {LienJointure::egal("IDENT", kLien, "COMPOSANT_IDENT")},
+                        {},
+                        true,
+                        std::move(colonnes)});
+  }
+  auto lignes = session().db().joindre(j);
+  RowId budget = 0;
+  RowId ligne = 0;
+  bool budgetRetenu = false;
+  bool ligneRetenue = false;
+  while (lignes->suivant()) {
+    if (lignes->id(kBudget) != budget) {
+      budget = lignes->id(kBudget);
+      ligne = 0;
+      afebud_.poserLigne(budget, std::move(lignes->ligne(kBudget)));
+      budgetRetenu = appeler("CONTROLER_BUDGET") == 0;
+    }
+    if (!budgetRetenu) continue;
+    if (lignes->id(kLigne) != ligne) {
+      ligne = lignes->id(kLigne);
+      aflbud_.poserLigne(ligne, std::move(lignes->ligne(kLigne)));
+      ligneRetenue = lbudStyle_.entier() == 0;
+      if (ligneRetenue) appeler("CREER_TRI", "0");
+    }
+    if (!ligneRetenue || !lignes->presente(kLien)) continue;
+    quarvo_.poserLigne(lignes->id(kLien), std::move(lignes->ligne(kLien)));
+    std::string composant = lienComposant_.text();
+    std::string ptype = composant == "GAPECOM"   ? "2"
+                        : composant == "GAPEBL"  ? "3"
+                        : composant == "GAPEFAC" ? "4"
+                        : composant == "AFEFFO"  ? "5"
+                                                 : "";
+    if (ptype.empty()) continue;
+    if (ptype != "5") {
+      // The header of the linked piece, or none when the piece is gone.
+      size_t t = ptype == "2" ? kCommande : ptype == "3" ? kReception : kFacture;
+      Table& entete = ptype == "2" ? gapecom_ : ptype == "3" ? gapebl_ : gapefac_;
+      if (lignes->presente(t)) {
+        entete.poserLigne(lignes->id(t), std::move(lignes->ligne(t)));
+      } else {
+        entete.preparer();
       }
     }
+    appeler("CREER_TRI", ptype);
   }
 }
 
@@ -396,7 +437,7 @@ void QUARVOSeletat1::creer_tri(Evt* evt) {
   auto found = lignes_.find(key);
   if (found == lignes_.end() || mAppr1_.aller(found->second) != 0) {
     mAppr1_.preparer();
-    auto put = [this](const char* column, Valeur v) { mAppr1_.ecrire(column, v); };
+    auto put = [this](const char* column, Valeur v) { mAppr1_.ecrire(column, std::move(v)); };
     std::string numero = lbudNumero_.text();
     put("IDENT", Valeur::chaine(key));
     put("CRITERE", Valeur::chaine(vcritere_.text()));
@@ -432,10 +473,7 @@ void QUARVOSeletat1::creer_tri(Evt* evt) {
       if (type == "5") {
         put("PIECE", Valeur::chaine("F " + numeroPiece));
       } else {
-        const std::string composant = lienComposant_.text();
-        EvtParamRef lecture{val(lienComposantIdent_.text())};
-        appelerProcedure("*1", composant, "INTERFACE", "LECTURE", &lecture, -1);
-        Table& header = type == "2" ? iGapecom_ : type == "3" ? iGapebl_ : iGapefac_;
+        Table& header = type == "2" ? gapecom_ : type == "3" ? gapebl_ : gapefac_;
         put("DESIG", Valeur::chaine(header.valeur("DESIG").toChaine()));
         put("ORIGINE", Valeur::chaine(header.valeur("ORIGINE").toChaine()));
         std::string prefix = type == "2" ? "BC " : type == "3" ? "BR " : "";
@@ -471,7 +509,9 @@ void QUARVOSeletat1::traiter_etat(Evt*) {
   if (vsortie_.entier() == 0) {
     EvtParamVal evt{val(vfichier_.text())};
     appelerModule("", "QUARVO", "QUARVO-EXPETAT1", &evt);
+    lecture_.reset();
   } else {
+    lecture_.reset();
     EvtParamVal sel{val("AEBV")};
     appelerProcedure("", "", "", "CONSTRUIRE_VSELECTION", &sel, 0);
     voptions_.set(vfolio_.text() + vcorps_.text() + vcorps2_.text() + vrecap1_.text() +

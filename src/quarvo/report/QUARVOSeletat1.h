@@ -7,19 +7,25 @@
 // budget line (type "0"), one row per piece linked to it (types "2" order, "3" goods-received
 // note, "4" invoice, "5" other document) and, when "VPERIO_ANT" is 1, one row per line gathering
 // the pieces dated before the period (type "1", "AVANT " + start date). Pieces linked twice to
-// one line add up in one row. The table then goes to the export ("QUARVO-EXPETAT1") or to the
-// printing ("QUARVO-IMPETAT1"), and the export file name is kept as the user's preference.
+// one line add up in one row. The budgets of a project, their lines, the lines' links and the
+// linked pieces' headers are read in one join, and the whole table is built from one moment of
+// the database: other users go on writing meanwhile, the report sees none of it (the export
+// reads its labels in that same moment; the printing, launched after it, reads them as it
+// goes). The table then goes to the export ("QUARVO-EXPETAT1") or to the printing
+// ("QUARVO-IMPETAT1"), and the export file name is kept as the user's preference.
 //
 // Refusals: no part of the report chosen (message "99"); the period's end after the current
 // fiscal year (message "100" with that year's end); no end date (message "65"); one project
 // chosen without its code (message "438"). A project or budget failing its control is skipped.
 #pragma once
 
+#include <optional>
 #include <string>
 #include <unordered_map>
 
 #include "host/automate/Seletat.h"
 #include "host/table/Champ.h"
+#include "host/table/Database.h"
 
 namespace quarvo {
 
@@ -86,9 +92,10 @@ class QUARVOSeletat1 : public host::Seletat {
   host::Table afebud_;
   host::Table aflbud_;
   host::Table quarvo_;
-  host::Table iGapecom_;
-  host::Table iGapebl_;
-  host::Table iGapefac_;
+  // The piece header of the link being gathered, as the join read it.
+  host::Table gapecom_;
+  host::Table gapebl_;
+  host::Table gapefac_;
 
   host::Champ affaCode_;
   host::Champ affaIdent_;
@@ -109,13 +116,14 @@ class QUARVOSeletat1 : public host::Seletat {
   host::Champ lienIdent_;
   host::Champ lienDate_;
   host::Champ lienComposant_;
-  host::Champ lienComposantIdent_;
   host::Champ lienPiece_;
   host::Champ lienHt_;
 
   // Rows of "M_APPR1" built by this validation, by key: the table is emptied at each
   // validation and only this screen writes it while it is built.
   std::unordered_map<std::string, host::RowId> lignes_;
+  // The moment the table is built from: from the validation to the end of the export.
+  std::optional<host::Lecture> lecture_;
 };
 
 }  // namespace quarvo

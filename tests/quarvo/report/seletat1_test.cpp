@@ -1,8 +1,13 @@
 #include <gtest/gtest.h>
 
+#include <chrono>
+#include <functional>
 #include <set>
 
+#include "host/session/Session.h"
+#include "host/table/SqliteDatabase.h"
 #include "host/ui/Ecran.h"
+#include "host/ui/ScriptedDriver.h"
 #include "quarvo/report/ReportFixture.h"
 
 namespace quarvo {
@@ -184,6 +189,74 @@ TEST(Seletat1Test, ProjectsFollowRangesRightsCriterionAndBudgetOptions) {
   ReportFixture::poser(w, "VAFFA_CHOIX", "T");
   f.lever(w, "VALID");
   EXPECT_EQ(budgets(), "AFF003/BU26-0003// ");
+}
+
+// A driver that runs `pendant` when the gauge first shows: the selection has begun reading.
+class PiloteAvecEcriture : public host::ScriptedDriver {
+ public:
+  std::function<void()> pendant;
+  void attenteJauge(int64_t done, int64_t total) override {
+    if (pendant) std::exchange(pendant, nullptr)();
+    ScriptedDriver::attenteJauge(done, total);
+  }
+};
+
+TEST(Seletat1Test, AnotherUsersWriteDuringTheSelectionWaitsForNothingAndIsNotSeen) {
+  ReportFixture f;
+  Automate& w = f.preparer((f.t().dir() / "suivi.txt").string());
+  ASSERT_EQ(f.lever(w, "VALID"), 0);
+  const std::string avant = f.lignes();
+  ASSERT_TRUE(contient(avant,
+                       "0000000213|2|CF26000003 | BC CF26000003 | Reprise des murets de "
+                       "la cour | 0.00 3600.00 0.00 0.00\n"));
+
+  // Another user's session on the same file runs the same selection; a third connection moves
+  // an amount from the first project to the last one while it reads.
+  PiloteAvecEcriture pilote;
+  host::Session autreSession(f.t().db(), pilote, "DEMO", "demo");
+  autreSession.setDataDir(test::sourceDir() / "db");
+  host::Session::Scope scope(autreSession);
+  host::SqliteDatabase ecrivain(f.t().dir() / "test.db", false);
+  ecrivain.delaiAttente(std::chrono::milliseconds(100));
+  std::string echec = "not run";
+  pilote.pendant = [&] {
+    try {
+      ecrivain.execScript(R"(BEGIN IMMEDIATE;
+        UPDATE "QUARVO" SET "HT" = '2000.00' WHERE "IDENT" = 'L06';
+        UPDATE "QUARVO" SET "HT" = '1950.00' WHERE "IDENT" = 'L12';
+        INSERT INTO "QUARVO" ("IDENT","AFEBUD_IDENT","AFAFFA_IDENT","AFAFFA_CODE","AFLBUD_IDENT",
+          "COMPOSANT","COMPOSANT_IDENT","PIECE","DATE_PIECE","QTE","HT") VALUES ('L15','0000000202',
+          '0000000012','AFF002','0000000221','GAPECOM','0000000401','CF26000001','2026-07-01',1,'5.00');
+        COMMIT;)");
+      echec.clear();
+    } catch (const std::exception& e) {
+      echec = e.what();
+    }
+  };
+  autreSession.appelerModule("QUARVO-SELETAT1", nullptr);
+  Automate* ecran = autreSession.fenetre("QUARVO-SELETAT1");
+  ASSERT_NE(ecran, nullptr);
+  ReportFixture::poser(*ecran, "VDATEMIN", "01/04/2026");
+  ReportFixture::poser(*ecran, "VDATEMAX", "31/12/2026");
+  ReportFixture::poser(*ecran, "VSORTIE", "0");
+  ReportFixture::poser(*ecran, "VFICHIER", (f.t().dir() / "autre.txt").string());
+  host::EvtParamVal valider;
+  ecran->raise("VALID", &valider);
+  autreSession.executerEnAttente();
+  EXPECT_EQ(echec, "");  // the writer did not wait for the report
+  // (From here on the other session is the current one: its "M_APPR1" is read.)
+  EXPECT_EQ(f.lignes(), avant);  // the report read the moment it began, whole
+  EXPECT_EQ(ReportFixture::lire(f.t().dir() / "autre.txt"),
+            ReportFixture::lire(f.t().dir() / "suivi.txt"));
+
+  ecran->raise("VALID", &valider);
+  autreSession.executerEnAttente();
+  std::string apres = f.lignes();
+  EXPECT_TRUE(contient(apres,
+                       "0000000213|2|CF26000003 | BC CF26000003 | Reprise des murets de "
+                       "la cour | 0.00 2600.00 0.00 0.00\n"));
+  EXPECT_TRUE(contient(apres, "0.00 1950.00 0.00 0.00\n"));
+  EXPECT_TRUE(contient(apres, "0000000221|2|CF26000001 |"));
 }
 
 }  // namespace
