@@ -140,6 +140,17 @@ class Impression {
     }
   }
 
+  // A group that starts on a new page takes the headings of the groups above it along: the
+  // groups from level `first` down open here, and the first that asks for a page gets one.
+  void sauterSiUnGroupeLeVeut(const Partie& p, size_t first) {
+    for (size_t n = first; n < p.niveaux.size(); ++n) {
+      if (!p.niveaux[n].saut.empty() && condition(p.niveaux[n].saut)) {
+        doc_.nouvellePage();
+        return;
+      }
+    }
+  }
+
   void lever(const std::string& label) {
     EvtParamVal e;
     a_.raise(label, &e);
@@ -202,13 +213,7 @@ class Impression {
         t->aller(id);
       }
       size_t first = precedent ? change : 0;
-      // A group that starts on a new page takes the headings of the groups above it along.
-      for (size_t n = first; n < levels; ++n) {
-        if (!p.niveaux[n].saut.empty() && condition(p.niveaux[n].saut)) {
-          doc_.nouvellePage();
-          break;
-        }
-      }
+      sauterSiUnGroupeLeVeut(p, first);
       for (size_t n = first; n < levels; ++n) {
         courants[n] = t->valeur(p.niveaux[n].rupture).toChaine();
         groupes[n].clear();
@@ -315,12 +320,7 @@ class Impression {
       }
       t.aller(g.premier);
       size_t first = precedent ? change : 0;
-      for (size_t n = first; n < levels; ++n) {
-        if (!p.niveaux[n].saut.empty() && condition(p.niveaux[n].saut)) {
-          doc_.nouvellePage();
-          break;
-        }
-      }
+      sauterSiUnGroupeLeVeut(p, first);
       for (size_t n = first; n < levels; ++n) {
         courants[n] = cle[n].toChaine();
         groupes[n].clear();
