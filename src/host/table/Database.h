@@ -43,6 +43,15 @@ class Database {
   virtual void finirLecture() = 0;
   // Runs a join (see Jointure.h). Throws UException for an unknown table or column.
   virtual std::unique_ptr<CurseurJoint> joindre(const Jointure& jointure) = 0;
+  // A mark of the data held: it changes whenever rows are written, by another program
+  // (`autres`) or through this connection (`miennes`). Two equal marks say that nothing was
+  // written in between.
+  struct Marque {
+    int64_t autres = -1;
+    int64_t miennes = -1;
+    bool operator==(const Marque&) const = default;
+  };
+  virtual Marque marque() = 0;
 };
 
 // Begins a read of one moment in its constructor and ends it in its destructor.

@@ -224,6 +224,16 @@ void SqliteDatabase::verifierVersion() {
   dataVersion_ = version;
 }
 
+Database::Marque SqliteDatabase::marque() {
+  // SQLite's data version changes when another connection commits; this connection's own
+  // writes are counted by the rows it changed (committed or not: a mark that changes for
+  // nothing only costs a selection made again).
+  sqlite3_stmt* st = prepare("PRAGMA data_version");
+  Reset reset{st};
+  int64_t version = sqlite3_step(st) == SQLITE_ROW ? sqlite3_column_int64(st, 0) : -1;
+  return {version, sqlite3_total_changes64(db_.get())};
+}
+
 void SqliteDatabase::commencerLecture() {
   if (depth_ > 0) {
     lectures_.push_back(false);

@@ -71,6 +71,7 @@ class SqliteDatabase : public Database {
   // reads: other connections go on writing; it sees none of what they commit.
   void commencerLecture() override;
   void finirLecture() override;
+  Marque marque() override;
   std::unique_ptr<CurseurJoint> joindre(const Jointure& jointure) override;
   // How long a statement waits for another connection's lock before it fails (30 s unless set).
   void delaiAttente(std::chrono::milliseconds delai);

@@ -1,6 +1,7 @@
 #include "quarvo/report/QUARVOSeletat1.h"
 
 #include <atomic>
+#include <set>
 #include <tuple>
 
 #include "host/Execute.h"
@@ -254,9 +255,20 @@ void QUARVOSeletat1::validation(Evt* evt) {
     appelerProcedure("*1", "AFSERV", "INTERFACE", "LECTURE_CODE", &serv, -1);
   }
 
-  // Every row of the report is read from one moment, without holding back other writers.
+  // The same selection asked again with nothing written since is the table already built: the
+  // outputs of one command (a text, a workbook, the pages) come from one selection.
   lecture_.reset();
+  marqueAvant_ = session().db().marque();
+  bool faite = selectionFaite_ && selectionFaite_->marque == marqueAvant_ &&
+               selectionFaite_->champs == champsDeSelection();
+  selectionFaite_.reset();
+  // Every row of the report is read from one moment, without holding back other writers.
   lecture_.emplace(session().db());
+  if (faite) {
+    lancer("TRAITER_ETAT");
+    erreurMethode(0, evt);
+    return;
+  }
   vvaleur1_.set(0.0);
   afficherJauge(0, 1);
   mAppr1_.effacerCriteres();
@@ -521,6 +533,24 @@ void QUARVOSeletat1::traiter_etat(Evt*) {
   }
   EvtParamRef pref{val("QUARVO-IMPETAT1"), val(session().utilisateur()), ref(vfichier_)};
   appelerProcedure("$$", "ACTION", "", "ECRIT_PREF", &pref, -1);
+  // The table stays what the data says while no other program wrote since before it was read:
+  // what this screen wrote since (the preference above) is no row the selection reads.
+  Database::Marque apres = session().db().marque();
+  if (apres.autres == marqueAvant_.autres) selectionFaite_ = Faite{champsDeSelection(), apres};
+}
+
+std::string QUARVOSeletat1::champsDeSelection() {
+  // Every field of the screen but the output's own (where, what kind, which parts are printed)
+  // decides the rows.
+  static const std::set<std::string> sortie{"VSORTIE", "VFICHIER", "VSELECTION", "VJAUGE", "VFOLIO",
+                                            "VCORPS",  "VCORPS2",  "VRECAP1",    "VRECAP2"};
+  std::string cle;
+  for (const auto& c : ecran().description().champs) {
+    if (sortie.count(c.nom) > 0) continue;
+    Field* f = champ(c.nom);
+    cle += c.nom + '=' + (f != nullptr ? f->text() : std::string()) + '\x1f';
+  }
+  return cle;
 }
 
 }  // namespace quarvo

@@ -124,6 +124,15 @@ class QUARVOSeletat1 : public host::Seletat {
   std::unordered_map<std::string, host::RowId> lignes_;
   // The moment the table is built from: from the validation to the end of the export.
   std::optional<host::Lecture> lecture_;
+  // What the report table holds: the selection it was built from and the data's mark once its
+  // output was made (nothing when it must be built again); the mark before it was built.
+  struct Faite {
+    std::string champs;
+    host::Database::Marque marque;
+  };
+  std::optional<Faite> selectionFaite_;
+  host::Database::Marque marqueAvant_;
+  std::string champsDeSelection();
 };
 
 }  // namespace quarvo

@@ -1,6 +1,7 @@
 #include <gtest/gtest.h>
 
 #include <chrono>
+#include <filesystem>
 #include <functional>
 #include <set>
 
@@ -192,6 +193,39 @@ TEST(Seletat1Test, ProjectsFollowRangesRightsCriterionAndBudgetOptions) {
 }
 
 // A driver that runs `pendant` when the gauge first shows: the selection has begun reading.
+// The outputs of one command (a text, then a workbook, then the pages) come from one selection:
+// validating the same selection again with nothing written since makes only the output. A
+// write by anyone, or another selection, builds the table again.
+TEST(Seletat1Test, OneSelectionGivesEveryOutputUntilSomethingIsWritten) {
+  ReportFixture f;
+  Automate& w = f.preparer((f.t().dir() / "suivi.txt").string());
+  auto selectionne = [&](const std::string& fichier) {
+    f.t().ui().clear();
+    ReportFixture::poser(w, "VFICHIER", (f.t().dir() / fichier).string());
+    EXPECT_EQ(f.lever(w, "VALID"), 0);
+    EXPECT_TRUE(std::filesystem::exists(f.t().dir() / fichier)) << fichier;
+    return contient(f.t().ui().transcriptText(), "ATTENTE Sélection en cours");
+  };
+  EXPECT_TRUE(selectionne("suivi.txt"));
+  const std::string table = f.lignes();
+  EXPECT_FALSE(selectionne("suivi.xlsx"));
+  EXPECT_EQ(f.lignes(), table);
+
+  // Another program changes an amount: the next output is built from the file again.
+  host::SqliteDatabase ecrivain(f.t().dir() / "test.db", false);
+  ecrivain.execScript(R"(UPDATE "QUARVO" SET "HT" = '2000.00' WHERE "IDENT" = 'L06')");
+  EXPECT_TRUE(selectionne("apres.txt"));
+  EXPECT_TRUE(contient(f.lignes(), "CF26000003 | Reprise des murets de la cour | 0.00 2600.00"))
+      << f.lignes();
+  EXPECT_FALSE(selectionne("encore.txt"));
+
+  // This session writes, or the selection changes: built again too.
+  f.t().sql(R"(UPDATE "QUARVO" SET "HT" = '3000.00' WHERE "IDENT" = 'L06')");
+  EXPECT_TRUE(selectionne("ecrit.txt"));
+  ReportFixture::poser(w, "VDATEMAX", "30/11/2026");
+  EXPECT_TRUE(selectionne("novembre.txt"));
+}
+
 class PiloteAvecEcriture : public host::ScriptedDriver {
  public:
   std::function<void()> pendant;
