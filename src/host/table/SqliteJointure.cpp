@@ -63,7 +63,7 @@ RequeteJointe construireJointure(const Jointure& jointure,
         // As a cursor's "starts with": a range an index can serve.
         conditions += mien + " >= " + autre + " || ? AND " + mien + " < " + autre + " || ?";
         valeurs.push_back(Valeur::chaine(lien.suite));
-        valeurs.push_back(Valeur::chaine(lien.suite + "\xF4\x8F\xBF\xBF"));
+        valeurs.push_back(Valeur::chaine(apresLePrefixe(lien.suite)));
       } else {
         conditions += mien + " = " + autre;
       }

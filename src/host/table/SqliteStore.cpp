@@ -351,16 +351,17 @@ void SqliteStore::step(sqlite3_stmt* st, const char* what) {
   statements_.fail(quoi);
 }
 
+std::string apresLePrefixe(const std::string& prefix) {
+  return prefix + "\xF4\x8F\xBF\xBF";
+}
+
 std::string sqlCritere(const ColumnInfo& col, const std::string& prefixe, const Criterion& c,
                        std::vector<Valeur>& binds) {
   std::string q = prefixe + sqlIdent(col.name);
   if (c.op == '/') {
-    // "Starts with" as a range, so that an index on the column serves it: every text that
-    // starts with the prefix sorts between the prefix and the prefix followed by the highest
-    // character (texts compare bytewise, and valid UTF-8 has no byte above F4).
     std::string prefix = c.value.toChaine();
     binds.push_back(Valeur::chaine(prefix));
-    binds.push_back(Valeur::chaine(prefix + "\xF4\x8F\xBF\xBF"));
+    binds.push_back(Valeur::chaine(apresLePrefixe(prefix)));
     return q + " >= ? AND " + q + " < ?";
   }
   const char* cmp = c.op == '+' ? " >= ?" : c.op == '-' ? " <= ?" : " = ?";

@@ -20,6 +20,9 @@ namespace quarvo::host {
 
 class SqliteDatabase;
 
+// Past every text that starts with `prefix`: "starts with" is the range [prefix, this), which an
+// index on the column serves (texts compare bytewise, and valid UTF-8 has no byte above F4).
+std::string apresLePrefixe(const std::string& prefix);
 // The SQL of criterion `c` on column `col` of the table written `prefixe` ("" or "t1."), its
 // values added to `binds`: as every selection of the store writes it.
 std::string sqlCritere(const ColumnInfo& col, const std::string& prefixe, const Criterion& c,
