@@ -188,7 +188,7 @@ std::vector<BudgetEcarte> budgetsEcartes(const std::optional<std::string>& only)
     size_t barre = numero.find('|');
     if (barre == std::string::npos || barre == 0) continue;
     std::string budget = t.valeur("AFEBUD_IDENT").toChaine();
-    if (numero.compare(0, barre, budget) == 0 && budget.size() == barre) continue;
+    if (budget == numero.substr(0, barre)) continue;
     out.push_back({t.valeur("IDENT").toChaine(), numero, budget, numero.substr(0, barre)});
   }
   return out;
